@@ -1,0 +1,60 @@
+# Helpers shared by every folder: warnings, sanitizers, libraries, tests, fuzzers.
+
+set(FK_WARNINGS -Wall -Wextra)
+set(FK_SANITIZER_FLAGS -fsanitize=address,undefined,leak -fno-omit-frame-pointer -fno-sanitize-recover=undefined)
+
+function(fk_apply_common_options target)
+  target_compile_options(${target} PRIVATE ${FK_WARNINGS})
+  if(FK_SANITIZE)
+    target_compile_options(${target} PRIVATE ${FK_SANITIZER_FLAGS})
+    target_link_options(${target} PRIVATE ${FK_SANITIZER_FLAGS})
+  endif()
+endfunction()
+
+# fk_add_library(name SOURCES ... DEPS ...): a static library of one folder.
+function(fk_add_library name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;DEPS" ${ARGN})
+  add_library(${name} STATIC ${ARG_SOURCES})
+  target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
+  target_link_libraries(${name} PUBLIC ${ARG_DEPS})
+  fk_apply_common_options(${name})
+  if(FK_SANITIZE)
+    target_compile_options(${name} PUBLIC ${FK_SANITIZER_FLAGS})
+    target_link_options(${name} PUBLIC ${FK_SANITIZER_FLAGS})
+  endif()
+endfunction()
+
+# fk_add_test(name SOURCES ... DEPS ...): one GoogleTest program, registered with CTest.
+function(fk_add_test name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;DEPS" ${ARGN})
+  find_package(GTest REQUIRED)
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_DEPS} GTest::gtest GTest::gtest_main)
+  fk_apply_common_options(${name})
+  add_test(NAME ${name} COMMAND ${name} --gtest_brief=1)
+endfunction()
+
+# fk_add_fuzzer(name SOURCES ... DEPS ... CORPUS dir RUNS n): a libFuzzer target,
+# run by CTest for a bounded number of executions over its seed corpus.
+function(fk_add_fuzzer name)
+  cmake_parse_arguments(ARG "" "CORPUS;RUNS" "SOURCES;DEPS" ${ARGN})
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_DEPS})
+  fk_apply_common_options(${name})
+  target_compile_options(${name} PRIVATE -fsanitize=fuzzer)
+  target_link_options(${name} PRIVATE -fsanitize=fuzzer)
+  if(NOT ARG_RUNS)
+    set(ARG_RUNS 20000)
+  endif()
+  add_test(NAME ${name}
+           COMMAND ${name} -runs=${ARG_RUNS} -seed=1 -max_len=4096 ${ARG_CORPUS})
+endfunction()
+
+# fk_add_bench(name SOURCES ... DEPS ...): a Google Benchmark program.
+function(fk_add_bench name)
+  cmake_parse_arguments(ARG "" "" "SOURCES;DEPS" ${ARGN})
+  find_package(benchmark REQUIRED)
+  add_executable(${name} ${ARG_SOURCES})
+  target_link_libraries(${name} PRIVATE ${ARG_DEPS} benchmark::benchmark)
+  fk_apply_common_options(${name})
+endfunction()
