@@ -172,7 +172,7 @@ template <class Self, class... Is> void* FindInterface(Self* S, const TGUID& IID
   return Found;
 }
 template <class T> TObject* Allocate() {
-  if constexpr (std::is_abstract_v<T>) return nullptr;
+  if constexpr (std::is_abstract_v<T> || !std::is_default_constructible_v<T>) return nullptr;
   else return new T();
 }
 template <class T> TClass BuildClass(const char* Name, const char* Unit);

@@ -1,0 +1,419 @@
+//===- platform/Classes.cpp - Persistents, components, collections -------===//
+#include "platform/Classes.h"
+
+#include <algorithm>
+#include <cstdio>
+
+namespace formkit {
+
+FK_RESOURCESTRING(SAssignError, "Cannot assign a %s to a %s");
+FK_RESOURCESTRING(SInvalidName, "'%s' is not a valid component name");
+FK_RESOURCESTRING(SDuplicateName, "A component named %s already exists");
+FK_RESOURCESTRING(SListIndexError, "List index out of bounds (%d)");
+FK_RESOURCESTRING(SDanglingReference, "Instance of Class %s has dangling reference count of %d");
+FK_RESOURCESTRING(SNotAComponentClass, "Class %s is not a component class");
+
+//===----------------------------------------------------------------------===//
+// TPersistent
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TPersistent, "Classes") {}
+
+void TPersistent::Assign(TPersistent* Source) {
+  if (Source) Source->AssignTo(this);
+  else AssignError(nullptr);
+}
+
+void TPersistent::AssignTo(TPersistent* Dest) { Dest->AssignError(this); }
+
+void TPersistent::AssignError(TPersistent* Source) {
+  throw EConvertError(SAssignError, Source ? Source->ClassName() : String("nil"), ClassName());
+}
+
+String TPersistent::GetNamePath() { return ClassName(); }
+
+void TPersistent::DefineProperties(TFiler*) {}
+
+//===----------------------------------------------------------------------===//
+// TComponent
+//===----------------------------------------------------------------------===//
+
+std::function<void(const String&, int)> DanglingComponentReferenceHook = [](const String& ClassName, int Count) {
+  std::fprintf(stderr, "%s\n", Format(LoadResString(SDanglingReference), ClassName, Count).c_str());
+};
+
+FK_IMPLEMENT(TComponent, "Classes") {
+  B.Property("Name", &TComponent::Name, &TComponent::SetName).Stored(false);
+  B.Property("Tag", &TComponent::Tag, &TComponent::SetTag).Default(0);
+}
+
+void TComponent::Create(TComponent* AOwner) {
+  if (AOwner) AOwner->InsertComponent(this);
+}
+
+TComponent* TComponent::Components(int Index) const {
+  if (Index < 0 || Index >= ComponentCount()) throw EListError(SListIndexError, Index);
+  return FComponents[static_cast<size_t>(Index)];
+}
+
+int TComponent::ComponentIndex() const {
+  if (!FOwner) return -1;
+  const auto& List = FOwner->FComponents;
+  // Searching from the back makes the common teardown order O(1).
+  for (size_t I = List.size(); I-- > 0;)
+    if (List[I] == this) return static_cast<int>(I);
+  return -1;
+}
+
+void TComponent::SetComponentIndex(int Index) {
+  if (!FOwner) return;
+  auto& List = FOwner->FComponents;
+  int Current = ComponentIndex();
+  if (Current < 0) return;
+  Index = std::clamp(Index, 0, static_cast<int>(List.size()) - 1);
+  if (Index == Current) return;
+  List.erase(List.begin() + Current);
+  List.insert(List.begin() + Index, this);
+}
+
+TComponent* TComponent::FindComponent(std::string_view Name) const {
+  if (Name.empty() || FNameIndex.empty()) return nullptr;
+  auto It = FNameIndex.find(UpperCase(Name));
+  return It == FNameIndex.end() ? nullptr : It->second;
+}
+
+void TComponent::IndexName(TComponent* Component) {
+  if (!Component->FName.empty()) FNameIndex[UpperCase(Component->FName)] = Component;
+}
+
+void TComponent::UnindexName(TComponent* Component) {
+  if (Component->FName.empty()) return;
+  auto It = FNameIndex.find(UpperCase(Component->FName));
+  if (It != FNameIndex.end() && It->second == Component) FNameIndex.erase(It);
+}
+
+void TComponent::InsertComponent(TComponent* Component) {
+  ValidateRename(Component, "", Component->FName);
+  Insert(Component);
+  if (FComponentState.Contains(csDesigning)) Component->SetDesigning(true);
+  SendNotification(Component, opInsert);
+}
+
+void TComponent::RemoveComponent(TComponent* Component) {
+  SendNotification(Component, opRemove);
+  Remove(Component);
+}
+
+void TComponent::Insert(TComponent* Component) {
+  FComponents.push_back(Component);
+  Component->FOwner = this;
+  IndexName(Component);
+}
+
+void TComponent::Remove(TComponent* Component) {
+  UnindexName(Component);
+  for (size_t I = FComponents.size(); I-- > 0;)
+    if (FComponents[I] == Component) {
+      FComponents.erase(FComponents.begin() + static_cast<std::ptrdiff_t>(I));
+      break;
+    }
+  Component->FOwner = nullptr;
+}
+
+void TComponent::DestroyComponents() {
+  // While the owner goes, its components need not hear of each other's removal: what
+  // holds a reference across owners is linked by FreeNotification and told directly.
+  while (!FComponents.empty()) {
+    TComponent* Last = FComponents.back();
+    Remove(Last);
+    Last->Destroy();
+  }
+}
+
+void TComponent::SetName(const String& NewName) {
+  if (FName == NewName) return;
+  if (!NewName.empty() && !IsValidIdent(NewName)) throw EComponentError(SInvalidName, NewName);
+  if (FOwner) FOwner->ValidateRename(this, FName, NewName);
+  else ValidateRename(nullptr, FName, NewName);
+  ChangeName(NewName);
+}
+
+void TComponent::ChangeName(const String& NewName) {
+  if (FOwner) FOwner->UnindexName(this);
+  FName = NewName;
+  if (FOwner) FOwner->IndexName(this);
+}
+
+void TComponent::ValidateRename(TComponent* Component, const String& CurName, const String& NewName) {
+  if (!Component || NewName.empty() || SameText(CurName, NewName)) return;
+  TComponent* Existing = FindComponent(NewName);
+  if (Existing && Existing != Component) throw EComponentError(SDuplicateName, NewName);
+}
+
+void TComponent::Notification(TComponent* AComponent, TOperation Operation) {
+  if (Operation != opRemove || !AComponent) return;
+  ForgetFreeNotification(AComponent);
+  // Owned components hear of a removal, so that references between siblings can be
+  // cleared. Insertions are told to the owner alone: telling every sibling would make
+  // filling an owner quadratic.
+  for (size_t I = FComponents.size(); I-- > 0;) {
+    if (I >= FComponents.size()) continue; // a handler may have removed components
+    FComponents[I]->SendNotification(AComponent, Operation);
+  }
+}
+
+void TComponent::SendNotification(TComponent* AComponent, TOperation Operation) {
+  for (TClass C = ClassType(); C && C->Generated; C = C->Parent)
+    if (C->OnNotification) {
+      C->OnNotification(this, AComponent, Operation);
+      break;
+    }
+  Notification(AComponent, Operation);
+}
+
+void TComponent::FreeNotification(TComponent* AComponent) {
+  if (!AComponent || AComponent == this) return;
+  auto Add = [](std::vector<TComponent*>& List, TComponent* C) {
+    if (std::find(List.begin(), List.end(), C) == List.end()) List.push_back(C);
+  };
+  Add(FFreeNotifies, AComponent);
+  Add(AComponent->FFreeNotifies, this);
+  FComponentState.Include(csFreeNotification);
+  AComponent->FComponentState.Include(csFreeNotification);
+}
+
+void TComponent::RemoveFreeNotification(TComponent* AComponent) {
+  if (!AComponent) return;
+  ForgetFreeNotification(AComponent);
+  AComponent->ForgetFreeNotification(this);
+}
+
+void TComponent::ForgetFreeNotification(TComponent* Component) {
+  auto It = std::find(FFreeNotifies.begin(), FFreeNotifies.end(), Component);
+  if (It != FFreeNotifies.end()) FFreeNotifies.erase(It);
+  if (FFreeNotifies.empty()) FComponentState.Exclude(csFreeNotification);
+}
+
+void TComponent::Loaded() { FComponentState.Exclude(csLoading); }
+
+void TComponent::GetChildren(const TGetChildProc&, TComponent*) {}
+
+void TComponent::SetChildOrder(TComponent*, int) {}
+
+void TComponent::SetParentComponent(TComponent*) {}
+
+void TComponent::SetComponentStateFlag(TComponentStateFlag Flag, bool Value) noexcept {
+  if (Value) FComponentState.Include(Flag);
+  else FComponentState.Exclude(Flag);
+}
+
+void TComponent::SetDesigning(bool Value, bool SetChildren) {
+  SetComponentStateFlag(csDesigning, Value);
+  if (SetChildren)
+    for (TComponent* C : FComponents) C->SetDesigning(Value, true);
+}
+
+void TComponent::SetDesignInstance(bool Value) { SetComponentStateFlag(csDesignInstance, Value); }
+void TComponent::SetAncestor(bool Value) {
+  SetComponentStateFlag(csAncestor, Value);
+  for (TComponent* C : FComponents) C->SetAncestor(Value);
+}
+void TComponent::SetInline(bool Value) { SetComponentStateFlag(csInline, Value); }
+void TComponent::SetLoading(bool Value) { SetComponentStateFlag(csLoading, Value); }
+void TComponent::SetReading(bool Value) { SetComponentStateFlag(csReading, Value); }
+void TComponent::SetWriting(bool Value) { SetComponentStateFlag(csWriting, Value); }
+
+IPtr<IDesignerNotify> TComponent::GetDesigner() { return nullptr; }
+
+String TComponent::GetNamePath() { return FName; }
+
+void TComponent::Destroying() {
+  if (FComponentState.Contains(csDestroying)) return;
+  FComponentState.Include(csDestroying);
+  for (TComponent* C : FComponents) C->Destroying();
+}
+
+void TComponent::BeforeDestruction() {
+  // Tell everyone linked across owners, then free the owned components.
+  while (!FFreeNotifies.empty()) {
+    TComponent* Other = FFreeNotifies.back();
+    FFreeNotifies.pop_back();
+    Other->ForgetFreeNotification(this);
+    Other->SendNotification(this, opRemove);
+  }
+  FComponentState.Exclude(csFreeNotification);
+  DestroyComponents();
+  if (FOwner) FOwner->RemoveComponent(this);
+  if (FRefTally > 0 && DanglingComponentReferenceHook) DanglingComponentReferenceHook(ClassName(), FRefTally);
+  inherited::BeforeDestruction();
+}
+
+TComponent* CreateComponent(TClass Class, TComponent* Owner) {
+  if (!Class->InheritsFrom(TComponent::StaticClass())) throw EComponentError(SNotAComponentClass, Class->ClassName);
+  auto* Instance = static_cast<TComponent*>(Class->NewInstance());
+  RunConstructor(Instance, Owner);
+  return Instance;
+}
+
+void RunConstructor(TComponent* Instance, TComponent* Owner) {
+  try {
+    Instance->Create(Owner);
+    Instance->AfterConstruction();
+  } catch (...) {
+    Instance->Destroy();
+    throw;
+  }
+}
+
+//===----------------------------------------------------------------------===//
+// Collections
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TCollectionItem, "Classes") {}
+FK_IMPLEMENT(TCollection, "Classes") {}
+FK_IMPLEMENT(TOwnedCollection, "Classes") {}
+
+void TCollectionItem::Create(TCollection* ACollection) { SetCollection(ACollection); }
+
+void TCollectionItem::SetCollection(TCollection* Value) {
+  if (FCollection == Value) return;
+  if (FCollection) FCollection->RemoveItem(this);
+  if (Value) Value->InsertItem(this);
+}
+
+int TCollectionItem::Index() const {
+  if (!FCollection) return -1;
+  const auto& Items = FCollection->FItems;
+  auto It = std::find(Items.begin(), Items.end(), this);
+  return It == Items.end() ? -1 : static_cast<int>(It - Items.begin());
+}
+
+void TCollectionItem::SetIndex(int Value) {
+  int Current = Index();
+  if (Current < 0 || Value == Current) return;
+  auto& Items = FCollection->FItems;
+  if (Value < 0 || Value >= static_cast<int>(Items.size())) throw EListError(SListIndexError, Value);
+  Items.erase(Items.begin() + Current);
+  Items.insert(Items.begin() + Value, this);
+  Changed(true);
+}
+
+String TCollectionItem::GetDisplayName() { return ClassName(); }
+
+String TCollectionItem::GetNamePath() {
+  if (!FCollection) return ClassName();
+  return Format("%s[%d]", FCollection->GetNamePath(), Index());
+}
+
+TPersistent* TCollectionItem::GetOwner() { return FCollection; }
+
+void TCollectionItem::Changed(bool AllItems) {
+  if (FCollection && FCollection->UpdateCount() == 0) FCollection->Update(AllItems ? nullptr : this);
+}
+
+void TCollectionItem::BeforeDestruction() {
+  SetCollection(nullptr);
+  inherited::BeforeDestruction();
+}
+
+TCollectionItem* TCollection::Items(int Index) const {
+  if (Index < 0 || Index >= Count()) throw EListError(SListIndexError, Index);
+  return FItems[static_cast<size_t>(Index)];
+}
+
+TCollectionItem* TCollection::Add() {
+  TClass Class = FItemClass ? FItemClass : TCollectionItem::StaticClass();
+  auto* Item = static_cast<TCollectionItem*>(Class->NewInstance());
+  try {
+    Item->Create(this);
+    Item->AfterConstruction();
+  } catch (...) {
+    Item->Destroy();
+    throw;
+  }
+  return Item;
+}
+
+TCollectionItem* TCollection::Insert(int Index) {
+  if (Index < 0 || Index > Count()) throw EListError(SListIndexError, Index);
+  TCollectionItem* Item = Add();
+  Item->SetIndex(Index);
+  return Item;
+}
+
+void TCollection::Delete(int Index) { Items(Index)->Destroy(); }
+
+void TCollection::Clear() {
+  if (FItems.empty()) return;
+  BeginUpdate();
+  while (!FItems.empty()) FItems.back()->Destroy();
+  EndUpdate();
+}
+
+TCollectionItem* TCollection::FindItemID(int ID) const {
+  for (TCollectionItem* Item : FItems)
+    if (Item->FID == ID) return Item;
+  return nullptr;
+}
+
+void TCollection::EndUpdate() {
+  if (FUpdateCount > 0 && --FUpdateCount == 0) Changed();
+}
+
+void TCollection::Assign(TPersistent* Source) {
+  auto* Other = dynamic_cast<TCollection*>(Source);
+  if (!Other) {
+    inherited::Assign(Source);
+    return;
+  }
+  BeginUpdate();
+  try {
+    Clear();
+    for (TCollectionItem* Item : Other->FItems) Add()->Assign(Item);
+  } catch (...) {
+    EndUpdate();
+    throw;
+  }
+  EndUpdate();
+}
+
+String TCollection::GetNamePath() {
+  TPersistent* Owner = GetOwner();
+  if (!Owner) return ClassName();
+  String Path = Owner->GetNamePath();
+  if (Path.empty()) return ClassName();
+  for (PPropInfo P : Owner->ClassType()->Properties())
+    if (P->Kind() == tkClass && GetObjectProp(Owner, P) == this) return Path + "." + P->Name;
+  return Path + "." + ClassName();
+}
+
+void TCollection::Update(TCollectionItem*) {}
+
+void TCollection::Changed() {
+  if (FUpdateCount == 0) Update(nullptr);
+}
+
+void TCollection::InsertItem(TCollectionItem* Item) {
+  FItems.push_back(Item);
+  Item->FCollection = this;
+  Item->FID = FNextID++;
+  Changed();
+}
+
+void TCollection::RemoveItem(TCollectionItem* Item) {
+  for (size_t I = FItems.size(); I-- > 0;)
+    if (FItems[I] == Item) {
+      FItems.erase(FItems.begin() + static_cast<std::ptrdiff_t>(I));
+      break;
+    }
+  Item->FCollection = nullptr;
+  Changed();
+}
+
+void TCollection::BeforeDestruction() {
+  FUpdateCount = 1; // no change notifications while the items go
+  while (!FItems.empty()) FItems.back()->Destroy();
+  inherited::BeforeDestruction();
+}
+
+} // namespace formkit

@@ -1,0 +1,350 @@
+//===- platform/Classes.h - Persistents, components, collections ---------===//
+//
+// `TPersistent` (what can be assigned and streamed), `TComponent` (owned,
+// named, notified, flagged as on a design surface), `TCollection` with its
+// items, and the process-wide class registry with class groups.
+//
+// Construction is two-phase: the C++ constructor only initialises members; the
+// virtual `Create(Owner)` is the constructor logic, and every override calls
+// `inherited::Create` first.
+//
+// Example:
+//   TComponent* Form = CreateComponent(TMyForm::StaticClass(), nullptr);
+//   TComponent* Button = CreateComponent(TMyButton::StaticClass(), Form);
+//   Button->SetName("Button1");
+//   Form->Destroy();   // frees Button too
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include "platform/TypInfo.h"
+
+#include <unordered_map>
+
+namespace formkit {
+
+class TFiler;
+class TReader;
+class TWriter;
+class TCollection;
+
+FK_EXCEPTION(EComponentError, Exception);
+FK_EXCEPTION(EClassNotFound, EComponentError);
+FK_EXCEPTION(EFilerError, Exception);
+FK_EXCEPTION(EReadError, EFilerError);
+FK_EXCEPTION(EWriteError, EFilerError);
+FK_EXCEPTION(EInvalidProperty, EFilerError);
+
+FK_EVENT(TNotifyEvent, void(TObject* Sender));
+
+//===----------------------------------------------------------------------===//
+// TPersistent
+//===----------------------------------------------------------------------===//
+
+/// The base of everything that can be selected, assigned and streamed.
+class FK_API TPersistent : public TObject {
+  FK_CLASS(TPersistent, TObject)
+
+  /// Copies `Source` into this object; the default asks `Source->AssignTo(this)`,
+  /// which raises `EConvertError` "Cannot assign a %s to a %s".
+  virtual void Assign(TPersistent* Source);
+  /// A dotted path for display: a component's name followed by sub-object names.
+  virtual String GetNamePath();
+  /// Declares properties that are streamed without being published.
+  virtual void DefineProperties(TFiler* Filer);
+  /// The object this one belongs to for name paths; null at the top.
+  virtual TPersistent* GetOwner() { return nullptr; }
+
+protected:
+  virtual void AssignTo(TPersistent* Dest);
+  [[noreturn]] void AssignError(TPersistent* Source);
+};
+
+//===----------------------------------------------------------------------===//
+// TComponent
+//===----------------------------------------------------------------------===//
+
+FK_ENUM(TComponentStateFlag, std::uint8_t, csLoading, csReading, csWriting, csDestroying,
+        csDesigning, csAncestor, csUpdating, csFixups, csFreeNotification, csInline,
+        csDesignInstance)
+FK_SET(TComponentState, TComponentStateFlag)
+FK_ENUM(TComponentStyleFlag, std::uint8_t, csInheritable, csCheckPropAvail, csSubComponent,
+        csTransient)
+FK_SET(TComponentStyle, TComponentStyleFlag)
+
+/// What a root gives to whoever asks `FindRootDesigner`: told of changes to its objects.
+struct FK_API IDesignerNotify : IInterface {
+  FK_INTERFACE(IDesignerNotify, IInterface, "{B0F61B3E-5C1A-4C1E-9E63-3D2C6A0F4E01}")
+  virtual void Modified() = 0;
+  virtual void Notification(TPersistent* AnObject, TOperation Operation) = 0;
+};
+
+/// Called for each child in stream order by `GetChildren`.
+using TGetChildProc = std::function<void(TComponent* Child)>;
+
+/// An owned, named component. Not counted: its interface references keep a tally, and
+/// destroying a component that is still referenced reports it through
+/// `DanglingComponentReferenceHook`.
+class FK_API TComponent : public TPersistent, public IInterface {
+  FK_CLASS(TComponent, TPersistent)
+  FK_INTERFACES(IInterface)
+
+  /// The constructor logic: joins `AOwner`'s components. Overrides call it first.
+  virtual void Create(TComponent* AOwner);
+
+  // Ownership ---------------------------------------------------------------
+  TComponent* Owner() const noexcept { return FOwner; }
+  int ComponentCount() const noexcept { return static_cast<int>(FComponents.size()); }
+  /// The owned component at `Index`; raises `EListError` when out of range.
+  TComponent* Components(int Index) const;
+  /// The position among the owner's components, or -1 without owner.
+  int ComponentIndex() const;
+  void SetComponentIndex(int Index);
+  /// The owned component named `Name` without regard to case, or null. Complexity: O(1).
+  TComponent* FindComponent(std::string_view Name) const;
+  /// Adds `Component` to the owned components (validating its name) and notifies.
+  void InsertComponent(TComponent* Component);
+  /// Removes `Component` from the owned components and notifies.
+  void RemoveComponent(TComponent* Component);
+  /// Frees the owned components from the last to the first.
+  void DestroyComponents();
+
+  // Names -------------------------------------------------------------------
+  const String& Name() const noexcept { return FName; }
+  /// Validates the identifier, then asks `ValidateRename` for duplicates; raises
+  /// `EComponentError` "'%s' is not a valid component name" or
+  /// "A component named %s already exists".
+  virtual void SetName(const String& NewName);
+  /// Sets the name without validation or notification.
+  void ChangeName(const String& NewName);
+  /// Checks a rename of `Component` (owned by this one) for duplicates.
+  virtual void ValidateRename(TComponent* Component, const String& CurName, const String& NewName);
+
+  // Notifications -----------------------------------------------------------
+  /// Told when a component is inserted into or removed from this one, when a sibling is
+  /// removed from the owner, or when a component this one asked `FreeNotification` of
+  /// is going away. Overrides call the inherited one.
+  virtual void Notification(TComponent* AComponent, TOperation Operation);
+  /// Calls the class record's notification hook, then `Notification`.
+  void SendNotification(TComponent* AComponent, TOperation Operation);
+  /// Asks to be told (through `Notification` with `opRemove`) when `AComponent` goes away.
+  void FreeNotification(TComponent* AComponent);
+  void RemoveFreeNotification(TComponent* AComponent);
+
+  // Streaming and children --------------------------------------------------
+  /// Called once the component and its siblings have been read.
+  virtual void Loaded();
+  /// Calls `Proc` for each child written under this component, in stream order; `Root`
+  /// is the root being written.
+  virtual void GetChildren(const TGetChildProc& Proc, TComponent* Root);
+  /// Moves `Child` to `Order` among the children (stream order).
+  virtual void SetChildOrder(TComponent* Child, int Order);
+  /// The component this one is nested under in a stream (its parent); null by default.
+  virtual TComponent* GetParentComponent() { return nullptr; }
+  virtual bool HasParent() { return false; }
+  /// Makes `AParent` the parent component (widgets override).
+  virtual void SetParentComponent(TComponent* AParent);
+  // Streaming hooks (ReadState, WriteState) join here with the reader and writer.
+
+  // State -------------------------------------------------------------------
+  TComponentState ComponentState() const noexcept { return FComponentState; }
+  TComponentStyle ComponentStyle() const noexcept { return FComponentStyle; }
+  void SetComponentStyle(TComponentStyle Style) noexcept { FComponentStyle = Style; }
+  /// Marks as on a design surface; with `SetChildren`, the owned components too.
+  void SetDesigning(bool Value, bool SetChildren = true);
+  void SetDesignInstance(bool Value);
+  void SetAncestor(bool Value);
+  void SetInline(bool Value);
+  void SetLoading(bool Value);
+  void SetReading(bool Value);
+  void SetWriting(bool Value);
+  bool IsDesigning() const noexcept { return FComponentState.Contains(csDesigning); }
+
+  /// The designer the root of this component was given; null off a design surface.
+  virtual IPtr<IDesignerNotify> GetDesigner();
+  /// A free value for the component's user.
+  int Tag() const noexcept { return FTag; }
+  void SetTag(int Value) noexcept { FTag = Value; }
+  /// Packed position of a non-visual component on a design surface (left in the low
+  /// 16 bits, top in the high 16 bits).
+  std::int32_t DesignInfo() const noexcept { return FDesignInfo; }
+  void SetDesignInfo(std::int32_t Value) noexcept { FDesignInfo = Value; }
+
+  String GetNamePath() override;
+  TPersistent* GetOwner() override { return FOwner; }
+  int ObjAddRef() override { return ++FRefTally; }
+  int ObjRelease() override { return --FRefTally; }
+  int InterfaceTally() const noexcept { return FRefTally; }
+
+  void BeforeDestruction() override;
+
+protected:
+  void Destroying() override;
+  void SetComponentStateFlag(TComponentStateFlag Flag, bool Value) noexcept;
+
+private:
+  void Insert(TComponent* Component);
+  void Remove(TComponent* Component);
+  void IndexName(TComponent* Component);
+  void UnindexName(TComponent* Component);
+  void ForgetFreeNotification(TComponent* Component);
+
+  TComponent* FOwner = nullptr;
+  String FName;
+  int FTag = 0;
+  std::int32_t FDesignInfo = 0;
+  int FRefTally = 0;
+  TComponentState FComponentState;
+  TComponentStyle FComponentStyle{csInheritable};
+  std::vector<TComponent*> FComponents;
+  /// Owned components by name folded to upper case; unnamed ones are not indexed.
+  std::unordered_map<String, TComponent*> FNameIndex;
+  std::vector<TComponent*> FFreeNotifies;
+};
+
+/// Told when a component is destroyed while interface references to it remain:
+/// (class name, count). The default writes "Instance of Class %s has dangling reference
+/// count of %d" to the standard error stream.
+FK_API extern std::function<void(const String& ClassName, int Count)> DanglingComponentReferenceHook;
+
+/// Allocates a component of `Class` and runs its constructor with `Owner`: the class
+/// call of the virtual constructor. A constructor that throws destroys the instance.
+FK_API TComponent* CreateComponent(TClass Class, TComponent* Owner);
+/// Runs the constructor on an instance that `NewInstance` made, so flags set in between
+/// are seen by it. A constructor that throws destroys the instance and the exception passes on.
+FK_API void RunConstructor(TComponent* Instance, TComponent* Owner);
+
+/// The class call for a compiled class: `New<TButton>(Owner)` in component form.
+template <class T> T* CreateComponentOf(TComponent* Owner) {
+  return static_cast<T*>(CreateComponent(T::StaticClass(), Owner));
+}
+
+//===----------------------------------------------------------------------===//
+// Collections
+//===----------------------------------------------------------------------===//
+
+/// One item of a collection; created by the collection through its item class.
+class FK_API TCollectionItem : public TPersistent {
+  FK_CLASS(TCollectionItem, TPersistent)
+
+  /// The constructor logic: joins `ACollection`. Overrides call it first.
+  virtual void Create(TCollection* ACollection);
+  TCollection* Collection() const noexcept { return FCollection; }
+  /// Moves the item into another collection (or none).
+  void SetCollection(TCollection* Value);
+  int ID() const noexcept { return FID; }
+  int Index() const;
+  void SetIndex(int Value);
+  /// The name shown for the item; by default its class name.
+  virtual String GetDisplayName();
+  String GetNamePath() override;
+  TPersistent* GetOwner() override;
+  void BeforeDestruction() override;
+
+protected:
+  /// Tells the collection that this item (or, with `AllItems`, every item) changed.
+  void Changed(bool AllItems);
+
+private:
+  friend class TCollection;
+  TCollection* FCollection = nullptr;
+  int FID = 0;
+};
+
+/// A list of items of one class, owned by a component's property.
+class FK_API TCollection : public TPersistent {
+  FK_CLASS(TCollection, TPersistent)
+
+  TCollection() = default;
+  explicit TCollection(TClass ItemClass) : FItemClass(ItemClass) {}
+
+  TClass ItemClass() const noexcept { return FItemClass; }
+  int Count() const noexcept { return static_cast<int>(FItems.size()); }
+  /// The item at `Index`; raises `EListError` "List index out of bounds (%d)".
+  TCollectionItem* Items(int Index) const;
+  /// Creates a new item at the end.
+  TCollectionItem* Add();
+  /// Creates a new item at `Index`.
+  TCollectionItem* Insert(int Index);
+  void Delete(int Index);
+  void Clear();
+  TCollectionItem* FindItemID(int ID) const;
+  void BeginUpdate() noexcept { ++FUpdateCount; }
+  void EndUpdate();
+  int UpdateCount() const noexcept { return FUpdateCount; }
+  /// Replaces the items with copies of `Source`'s (a collection) items.
+  void Assign(TPersistent* Source) override;
+  /// "Owner.Property", the owner's path and the name of the property holding this collection.
+  String GetNamePath() override;
+  TPersistent* GetOwner() override { return nullptr; }
+  void BeforeDestruction() override;
+
+protected:
+  /// Called after a change to `Item`, or to all items when null, outside updates.
+  virtual void Update(TCollectionItem* Item);
+  void Changed();
+
+private:
+  friend class TCollectionItem;
+  void InsertItem(TCollectionItem* Item);
+  void RemoveItem(TCollectionItem* Item);
+
+  TClass FItemClass = nullptr;
+  std::vector<TCollectionItem*> FItems;
+  int FNextID = 0;
+  int FUpdateCount = 0;
+};
+
+/// A collection that knows the persistent it belongs to.
+class FK_API TOwnedCollection : public TCollection {
+  FK_CLASS(TOwnedCollection, TCollection)
+  TOwnedCollection() = default;
+  TOwnedCollection(TPersistent* AOwner, TClass ItemClass) : TCollection(ItemClass), FOwner(AOwner) {}
+  TPersistent* GetOwner() override { return FOwner; }
+
+private:
+  TPersistent* FOwner = nullptr;
+};
+
+//===----------------------------------------------------------------------===//
+// Class registry
+//===----------------------------------------------------------------------===//
+
+/// Registers a class by name in the group of its class (`ClassGroupOf`). Registering
+/// another class of the same name in the same group raises `EComponentError`
+/// "A class named %s already exists".
+FK_API void RegisterClass(TClass Class);
+FK_API void RegisterClasses(std::initializer_list<TClass> Classes);
+FK_API void UnRegisterClass(TClass Class);
+/// The class of that name in the current group or the base group; null when absent.
+FK_API TClass GetClass(std::string_view ClassName);
+/// Like `GetClass`, but raises `EClassNotFound` "Class %s not found".
+FK_API TClass FindClass(std::string_view ClassName);
+
+/// Starts a class group represented by `Group`; `Group` and its descendants belong to it
+/// unless a later group claims them.
+FK_API void StartClassGroup(TClass Group);
+/// Puts `Class` and its descendants into the group of `GroupClass`.
+FK_API void GroupDescendentsWith(TClass Class, TClass GroupClass);
+/// The class that represents the group of `Class`; `TPersistent` for the base group.
+FK_API TClass ClassGroupOf(TClass Class);
+FK_API TClass ClassGroupOf(const TObject* Instance);
+/// Makes the group of `Class` the current one; returns the class that represented the
+/// current group before, also when the group does not change.
+FK_API TClass ActivateClassGroup(TClass Class);
+/// The class that represents the current group.
+FK_API TClass CurrentGroup();
+
+/// The hook behind `RegisterNoIcon`; the design core installs its handler at start.
+FK_API extern std::function<void(const std::vector<TClass>& Classes)> RegisterNoIconProc;
+/// Passes `Classes` to `RegisterNoIconProc` when it is set.
+FK_API void RegisterNoIcon(const std::vector<TClass>& Classes);
+
+/// Walks up the owners of `Obj` to the root and returns the designer that root was
+/// given; null when the object is not on a design surface.
+FK_API IPtr<IDesignerNotify> FindRootDesigner(TPersistent* Obj);
+/// Resolves a dotted path of component names below `Root`, reaching through nested
+/// components; null when a step is missing.
+FK_API TComponent* FindNestedComponent(TComponent* Root, std::string_view Path);
+
+} // namespace formkit
