@@ -10,6 +10,13 @@ FK_IMPLEMENT(TSampleItem, "SampleUnit") {
   B.Field("Weight", &TSampleItem::Weight).Default(0);
 }
 
+void TSampleItem::Assign(TPersistent* Source) {
+  auto* Other = dynamic_cast<TSampleItem*>(Source);
+  if (!Other) return inherited::Assign(Source);
+  Text = Other->Text;
+  Weight = Other->Weight;
+}
+
 FK_IMPLEMENT(TSampleBase, "SampleUnit") {}
 
 void TSampleBase::Create(TComponent* AOwner) {

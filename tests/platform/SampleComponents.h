@@ -31,6 +31,7 @@ class TSampleService : public TInterfacedObject, public ISampleService {
 
 class TSampleItem : public TCollectionItem {
   FK_CLASS(TSampleItem, TCollectionItem)
+  void Assign(TPersistent* Source) override;
   String Text;
   int Weight = 0;
 };
