@@ -84,8 +84,8 @@ using PTypeInfo = const TTypeInfo*;
 /// Declares the identity, name and parent of an interface; put it first in the body.
 #define FK_INTERFACE(Name, Parent, Guid)                                                           \
   using inherited = Parent;                                                                        \
-  static constexpr ::formkit::TGUID IID = ::formkit::TGUID::Parse(Guid);                           \
-  static constexpr const char* InterfaceName = #Name;
+  [[maybe_unused]] static constexpr ::formkit::TGUID IID = ::formkit::TGUID::Parse(Guid);          \
+  [[maybe_unused]] static constexpr const char* InterfaceName = #Name;
 
 /// The root of every interface: identity query and counting.
 struct FK_API IInterface {

@@ -144,6 +144,7 @@ class FK_API TStringList : public TStrings {
   void PutObject(int Index, TObject* Obj) override;
   void Insert(int Index, const String& S) override;
   void InsertObject(int Index, const String& S, TObject* Obj) override;
+  int Add(const String& S) override { return AddObject(S, nullptr); }
   int AddObject(const String& S, TObject* Obj) override;
   void Delete(int Index) override;
   void Clear() override;

@@ -253,6 +253,11 @@ String FormatArgs(std::string_view Fmt, std::initializer_list<TFormatArg> Args) 
       else if (Conv == 'g') std::snprintf(Buf, sizeof Buf, "%.*G", P, V);
       else std::snprintf(Buf, sizeof Buf, "%.*f", P, V);
       Body = Buf;
+      if (Conv == 'e') { // exponents have at least three digits: 1.50E+003
+        size_t E = Body.find('E');
+        if (E != String::npos && E + 2 < Body.size())
+          while (Body.size() - (E + 2) < 3) Body.insert(E + 2, "0");
+      }
       if (Conv == 'n' || Conv == 'm') Body = ThousandsSeparated(Body);
       break;
     }

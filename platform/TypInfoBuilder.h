@@ -7,6 +7,8 @@
 //===----------------------------------------------------------------------===//
 #pragma once
 
+#include "platform/TypInfo.h"
+
 namespace formkit {
 
 namespace detail {
