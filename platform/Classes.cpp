@@ -77,20 +77,93 @@ void TComponent::SetComponentIndex(int Index) {
 }
 
 TComponent* TComponent::FindComponent(std::string_view Name) const {
-  if (Name.empty() || FNameIndex.empty()) return nullptr;
-  auto It = FNameIndex.find(UpperCase(Name));
-  return It == FNameIndex.end() ? nullptr : It->second;
+  return Name.empty() ? nullptr : FNameIndex.Find(Name);
 }
 
 void TComponent::IndexName(TComponent* Component) {
-  if (!Component->FName.empty()) FNameIndex[UpperCase(Component->FName)] = Component;
+  if (!Component->FName.empty()) FNameIndex.Insert(Component);
 }
 
 void TComponent::UnindexName(TComponent* Component) {
-  if (Component->FName.empty()) return;
-  auto It = FNameIndex.find(UpperCase(Component->FName));
-  if (It != FNameIndex.end() && It->second == Component) FNameIndex.erase(It);
+  if (!Component->FName.empty()) FNameIndex.Erase(Component);
 }
+
+//===----------------------------------------------------------------------===//
+// The name index
+//===----------------------------------------------------------------------===//
+
+namespace detail {
+namespace {
+TComponent* const Tombstone = reinterpret_cast<TComponent*>(std::uintptr_t(1));
+
+/// FNV-1a over the name folded to ASCII upper case, so the hash agrees with CompareText.
+std::uint64_t NameHash(std::string_view Name) noexcept {
+  std::uint64_t H = 14695981039346656037ull;
+  for (char C : Name) {
+    unsigned char U = static_cast<unsigned char>(C);
+    if (U >= 'a' && U <= 'z') U -= 32;
+    H = (H ^ U) * 1099511628211ull;
+  }
+  return H | 1; // never 0, so a zero hash marks nothing
+}
+} // namespace
+
+TComponent* TNameIndex::Find(std::string_view Name) const noexcept {
+  if (FCount == 0) return nullptr;
+  std::uint64_t H = NameHash(Name);
+  size_t Mask = FSlots.size() - 1;
+  for (size_t I = H & Mask;; I = (I + 1) & Mask) {
+    const Slot& S = FSlots[I];
+    if (!S.Component) return nullptr;
+    if (S.Hash == H && S.Component != Tombstone && SameText(S.Component->Name(), Name)) return S.Component;
+  }
+}
+
+void TNameIndex::Insert(TComponent* Component) {
+  if ((FUsed + 1) * 4 > FSlots.size() * 3) Grow();
+  std::uint64_t H = NameHash(Component->Name());
+  size_t Mask = FSlots.size() - 1;
+  size_t I = H & Mask;
+  while (FSlots[I].Component && FSlots[I].Component != Tombstone) I = (I + 1) & Mask;
+  if (!FSlots[I].Component) ++FUsed;
+  FSlots[I] = {H, Component};
+  ++FCount;
+}
+
+void TNameIndex::Erase(TComponent* Component) noexcept {
+  if (FCount == 0) return;
+  std::uint64_t H = NameHash(Component->Name());
+  size_t Mask = FSlots.size() - 1;
+  for (size_t I = H & Mask; FSlots[I].Component; I = (I + 1) & Mask)
+    if (FSlots[I].Component == Component) {
+      FSlots[I].Component = Tombstone;
+      if (--FCount == 0) Clear();
+      return;
+    }
+}
+
+void TNameIndex::Clear() noexcept {
+  FSlots.clear();
+  FCount = FUsed = 0;
+}
+
+void TNameIndex::Grow() {
+  std::vector<Slot> Old;
+  Old.swap(FSlots);
+  // Tombstones are dropped; double only when live entries need it.
+  size_t Size = 16;
+  while ((FCount + 1) * 2 > Size) Size *= 2;
+  FSlots.assign(Size, Slot{});
+  FUsed = FCount;
+  size_t Mask = Size - 1;
+  for (const Slot& S : Old) {
+    if (!S.Component || S.Component == Tombstone) continue;
+    size_t I = S.Hash & Mask;
+    while (FSlots[I].Component) I = (I + 1) & Mask;
+    FSlots[I] = S;
+  }
+}
+} // namespace detail
 
 void TComponent::InsertComponent(TComponent* Component) {
   ValidateRename(Component, "", Component->FName);
@@ -123,6 +196,8 @@ void TComponent::Remove(TComponent* Component) {
 void TComponent::DestroyComponents() {
   // While the owner goes, its components need not hear of each other's removal: what
   // holds a reference across owners is linked by FreeNotification and told directly.
+  // The name index goes at once rather than name by name.
+  FNameIndex.Clear();
   while (!FComponents.empty()) {
     TComponent* Last = FComponents.back();
     Remove(Last);

@@ -19,7 +19,6 @@
 
 #include "platform/TypInfo.h"
 
-#include <unordered_map>
 
 namespace formkit {
 
@@ -78,6 +77,33 @@ struct FK_API IDesignerNotify : IInterface {
   virtual void Modified() = 0;
   virtual void Notification(TPersistent* AnObject, TOperation Operation) = 0;
 };
+
+namespace detail {
+/// The owned components by name, without regard to case: an open-addressed table of
+/// (hash, component) pairs, so a lookup touches one cache line and the name it finds.
+/// Does not own the components; unnamed components are not held.
+class FK_API TNameIndex {
+public:
+  /// The component named `Name`, or null. Complexity: O(1) on average.
+  TComponent* Find(std::string_view Name) const noexcept;
+  /// Adds a named component that is not held yet.
+  void Insert(TComponent* Component);
+  /// Removes the component if held under its current name.
+  void Erase(TComponent* Component) noexcept;
+  void Clear() noexcept;
+  bool Empty() const noexcept { return FCount == 0; }
+
+private:
+  struct Slot {
+    std::uint64_t Hash = 0;
+    TComponent* Component = nullptr;
+  };
+  void Grow();
+  std::vector<Slot> FSlots; // size is zero or a power of two
+  size_t FCount = 0;        // live entries
+  size_t FUsed = 0;         // live entries and tombstones
+};
+} // namespace detail
 
 /// Called for each child in stream order by `GetChildren`.
 using TGetChildProc = std::function<void(TComponent* Child)>;
@@ -197,8 +223,7 @@ private:
   TComponentState FComponentState;
   TComponentStyle FComponentStyle{csInheritable};
   std::vector<TComponent*> FComponents;
-  /// Owned components by name folded to upper case; unnamed ones are not indexed.
-  std::unordered_map<String, TComponent*> FNameIndex;
+  detail::TNameIndex FNameIndex;
   std::vector<TComponent*> FFreeNotifies;
 };
 

@@ -259,3 +259,30 @@ TEST(Ownership, ADestroyedComponentStillReferencedIsReported) {
   ASSERT_EQ(Reports.size(), 1u);
   EXPECT_EQ(Reports[0], (std::pair<String, int>{"TSampleWidget", 1}));
 }
+
+TEST(Names, FindComponentAgreesWithAReferenceThroughRenamesAndRemovals) {
+  TComponent* Owner = CreateComponentOf<TComponent>(nullptr);
+  std::vector<TComponent*> All;
+  for (int I = 0; I < 600; ++I) {
+    All.push_back(CreateComponentOf<TComponent>(Owner));
+    All.back()->SetName("Item" + std::to_string(I));
+  }
+  // Rename every third, free every fifth, then re-use freed names: tombstones and growth.
+  for (int I = 0; I < 600; I += 3) All[static_cast<size_t>(I)]->SetName("Renamed" + std::to_string(I));
+  for (int I = 0; I < 600; I += 5) {
+    All[static_cast<size_t>(I)]->Destroy();
+    All[static_cast<size_t>(I)] = nullptr;
+  }
+  for (int I = 0; I < 600; I += 5) {
+    All[static_cast<size_t>(I)] = CreateComponentOf<TComponent>(Owner);
+    All[static_cast<size_t>(I)]->SetName("ITEM" + std::to_string(I));
+  }
+  for (int I = 0; I < 600; ++I) {
+    TComponent* C = All[static_cast<size_t>(I)];
+    EXPECT_EQ(Owner->FindComponent(C->Name()), C) << I;
+    EXPECT_EQ(Owner->FindComponent(LowerCase(C->Name())), C) << I;
+    if (I % 3 == 0 && I % 5 != 0) EXPECT_EQ(Owner->FindComponent("Item" + std::to_string(I)), nullptr) << I;
+  }
+  EXPECT_EQ(Owner->FindComponent("Item600"), nullptr);
+  Owner->Destroy();
+}
