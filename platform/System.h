@@ -180,6 +180,8 @@ FK_EXCEPTION(EInvalidCast, Exception);
 FK_EXCEPTION(EIntfCastError, Exception);
 FK_EXCEPTION(EInvalidPointer, Exception);
 FK_EXCEPTION(ENonAIRException, Exception);
+/// The design core's own exception.
+FK_EXCEPTION(EComponentDesignerException, ENonAIRException);
 
 /// Raises the silent `EAbort`.
 [[noreturn]] FK_API void Abort();

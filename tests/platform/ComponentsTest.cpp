@@ -281,7 +281,9 @@ TEST(Names, FindComponentAgreesWithAReferenceThroughRenamesAndRemovals) {
     TComponent* C = All[static_cast<size_t>(I)];
     EXPECT_EQ(Owner->FindComponent(C->Name()), C) << I;
     EXPECT_EQ(Owner->FindComponent(LowerCase(C->Name())), C) << I;
-    if (I % 3 == 0 && I % 5 != 0) EXPECT_EQ(Owner->FindComponent("Item" + std::to_string(I)), nullptr) << I;
+    if (I % 3 == 0 && I % 5 != 0) {
+      EXPECT_EQ(Owner->FindComponent("Item" + std::to_string(I)), nullptr) << I;
+    }
   }
   EXPECT_EQ(Owner->FindComponent("Item600"), nullptr);
   Owner->Destroy();
