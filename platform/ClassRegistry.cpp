@@ -118,7 +118,9 @@ TClass ActivateClassGroup(TClass Class) {
   return Previous;
 }
 
-TClass CurrentGroup() {
+int CurrentGroup = -1;
+
+TClass CurrentClassGroup() {
   Registry& R = TheRegistry();
   return R.Groups[R.Active].Representative;
 }

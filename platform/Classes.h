@@ -170,7 +170,12 @@ class FK_API TComponent : public TPersistent, public IInterface {
   virtual bool HasParent() { return false; }
   /// Makes `AParent` the parent component (widgets override).
   virtual void SetParentComponent(TComponent* AParent);
-  // Streaming hooks (ReadState, WriteState) join here with the reader and writer.
+  /// Reads this component's properties and children (`TReader::ReadData`).
+  virtual void ReadState(TReader* Reader);
+  /// Writes this component's prefix, properties and children (`TWriter::WriteData`).
+  virtual void WriteState(TWriter* Writer);
+  /// Defines "Left" and "Top": the design position kept in `DesignInfo`.
+  void DefineProperties(TFiler* Filer) override;
 
   // State -------------------------------------------------------------------
   TComponentState ComponentState() const noexcept { return FComponentState; }
@@ -357,8 +362,12 @@ FK_API TClass ClassGroupOf(const TObject* Instance);
 /// Makes the group of `Class` the current one; returns the class that represented the
 /// current group before, also when the group does not change.
 FK_API TClass ActivateClassGroup(TClass Class);
-/// The class that represents the current group.
-FK_API TClass CurrentGroup();
+/// The class that represents the current class group.
+FK_API TClass CurrentClassGroup();
+
+/// The group of the design package being loaded: registrations record it so that the
+/// package's registrations can be dropped when it unloads. -1 outside any package.
+FK_API extern int CurrentGroup;
 
 /// The hook behind `RegisterNoIcon`; the design core installs its handler at start.
 FK_API extern std::function<void(const std::vector<TClass>& Classes)> RegisterNoIconProc;

@@ -155,6 +155,7 @@ bool TStrings::Equals(const TStrings* Other) const {
 }
 
 void TStrings::Assign(TPersistent* Source) {
+  if (Source == this) return; // clearing first would lose the lines
   auto* Other = dynamic_cast<TStrings*>(Source);
   if (!Other) {
     inherited::Assign(Source);

@@ -184,13 +184,13 @@ TEST(Registry, ClassesByNameAndGroups) {
 
   TClass Previous = ActivateClassGroup(TListener::StaticClass());
   EXPECT_EQ(Previous, TPersistent::StaticClass());
-  EXPECT_EQ(CurrentGroup(), TListener::StaticClass());
+  EXPECT_EQ(CurrentClassGroup(), TListener::StaticClass());
   EXPECT_EQ(GetClass("TSpecial"), Special);
   EXPECT_EQ(GetClass("TSampleWidget"), TSampleWidget::StaticClass()); // the base group stays visible
   // Activating the same group again still answers the previous one.
   EXPECT_EQ(ActivateClassGroup(TListener::StaticClass()), TListener::StaticClass());
   EXPECT_EQ(ActivateClassGroup(Previous), TListener::StaticClass());
-  EXPECT_EQ(CurrentGroup(), TPersistent::StaticClass());
+  EXPECT_EQ(CurrentClassGroup(), TPersistent::StaticClass());
 
   TClass Clash = TClassRec::NewGeneratedClass(TListener::StaticClass(), "TSpecial", "Unit3");
   EXPECT_EQ(MessageOf<EComponentError>([&] { RegisterClass(Clash); }), "A class named TSpecial already exists");

@@ -48,6 +48,8 @@ TEST(StringList, NamesAndValuesWithoutRegardToCase) {
   EXPECT_EQ(List.IndexOfName("Left"), -1);
   EXPECT_EQ(List.Text(), "Top=25\r\nnovalue\r\nWidth=\r\nHeight=5\r\n");
   EXPECT_EQ(List.IndexOf("NOVALUE"), 1);
+  List.Assign(&List); // assigning a list to itself keeps its lines
+  EXPECT_EQ(List.Count(), 4);
 }
 
 TEST(StringList, SortedListsKeepOrderAndHandleDuplicates) {

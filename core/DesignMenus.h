@@ -1,0 +1,49 @@
+//===- core/DesignMenus.h - The host's menu layer ------------------------===//
+//
+// The interfaces through which local menus of the design surface and of the
+// structure tree are built. The host's menu layer implements them; nothing in
+// this library does. Operations join as their callers arrive.
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include "platform/TypInfo.h"
+
+namespace formkit {
+
+FK_ENUM(TLocalMenuType, std::uint8_t, lmBase, lmModule, lmSelection, lmComponent)
+FK_SET(TLocalMenuTypes, TLocalMenuType)
+
+/// The local menus that a module offers by default.
+inline constexpr TLocalMenuTypes CLocalMenusIf{lmBase, lmModule, lmSelection, lmComponent};
+
+/// The collection side of a menu.
+struct FK_API IMenuItems : IInterface {
+  FK_INTERFACE(IMenuItems, IInterface, "{4DE1A7A2-0EAD-5065-83A7-9DC3C5D2BF9E}")
+};
+struct FK_API IMenu : IInterface {
+  FK_INTERFACE(IMenu, IInterface, "{4214BC72-00B4-5F5F-989B-C21B9E916BF2}")
+};
+struct FK_API IMainMenu : IMenu {
+  FK_INTERFACE(IMainMenu, IMenu, "{43102423-65E8-559C-A65D-2518F792E797}")
+};
+struct FK_API IPopupMenu : IMenu {
+  FK_INTERFACE(IPopupMenu, IMenu, "{C004F6C0-3ACF-55D5-BDC0-744DC9DA8224}")
+};
+struct FK_API IMenuItem : IMenuItems {
+  FK_INTERFACE(IMenuItem, IMenuItems, "{97256079-5A09-5E47-8DFC-D850DC2A2EFA}")
+};
+struct FK_API IMenuItem2 : IMenuItem {
+  FK_INTERFACE(IMenuItem2, IMenuItem, "{F5C3E3AF-99FE-57F7-8435-FCE6885C771F}")
+};
+struct FK_API IMenuItem290 : IMenuItem2 {
+  FK_INTERFACE(IMenuItem290, IMenuItem2, "{CCAD6B9A-2FA1-5AC0-8083-BE3CA60693C0}")
+};
+struct FK_API IDesignLocalMenu140 : IInterface {
+  FK_INTERFACE(IDesignLocalMenu140, IInterface, "{B5F0098E-D3A7-5C8D-9F98-BDEDD302101F}")
+};
+struct FK_API IDesignLocalMenu : IDesignLocalMenu140 {
+  FK_INTERFACE(IDesignLocalMenu, IDesignLocalMenu140, "{7914F0B3-A657-5192-90A1-AE942B785FC2}")
+};
+
+} // namespace formkit
