@@ -22,6 +22,10 @@ function(fk_add_library name)
     target_compile_options(${name} PUBLIC ${FK_SANITIZER_FLAGS})
     target_link_options(${name} PUBLIC ${FK_SANITIZER_FLAGS})
   endif()
+  if(FK_FUZZ)
+    # Coverage for the fuzz targets that link the library; no fuzzer main here.
+    target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link)
+  endif()
 endfunction()
 
 # fk_add_test(name SOURCES ... DEPS ...): one GoogleTest program, registered with CTest.
@@ -34,8 +38,10 @@ function(fk_add_test name)
   add_test(NAME ${name} COMMAND ${name} --gtest_brief=1)
 endfunction()
 
-# fk_add_fuzzer(name SOURCES ... DEPS ... CORPUS dir RUNS n): a libFuzzer target,
-# run by CTest for a bounded number of executions over its seed corpus.
+# fk_add_fuzzer(name SOURCES ... DEPS ... CORPUS dir RUNS n): a libFuzzer target, run by
+# CTest for a bounded number of executions over its seed corpus. libFuzzer writes new
+# inputs into the first corpus directory, so a scratch directory of the build tree goes
+# first and the seeds of the source tree second: the source tree is never written.
 function(fk_add_fuzzer name)
   cmake_parse_arguments(ARG "" "CORPUS;RUNS" "SOURCES;DEPS" ${ARGN})
   add_executable(${name} ${ARG_SOURCES})
@@ -46,8 +52,10 @@ function(fk_add_fuzzer name)
   if(NOT ARG_RUNS)
     set(ARG_RUNS 20000)
   endif()
+  set(scratch ${CMAKE_CURRENT_BINARY_DIR}/scratch-corpus)
+  file(MAKE_DIRECTORY ${scratch})
   add_test(NAME ${name}
-           COMMAND ${name} -runs=${ARG_RUNS} -seed=1 -max_len=4096 ${ARG_CORPUS})
+           COMMAND ${name} -runs=${ARG_RUNS} -seed=1 -max_len=4096 ${scratch} ${ARG_CORPUS})
 endfunction()
 
 # fk_add_bench(name SOURCES ... DEPS ...): a Google Benchmark program.
