@@ -1,0 +1,7 @@
+unit [!Name];
+
+[!if=(Flag)]
+flag on
+[!else]
+flag off
+[!endif]

@@ -1,0 +1,2 @@
+begin
+[!foreach(i in items)][!i.x][!endforeach]|[!i.x]

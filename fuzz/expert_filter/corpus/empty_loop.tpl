@@ -1,0 +1,4 @@
+[!foreach(none)]
+body[!set(ran,yes)]
+[!endforeach]
+[!ran] [!endforeach]

@@ -1,0 +1,3 @@
+[!foreach(i of items)]
+[!if=]
+[!settings]

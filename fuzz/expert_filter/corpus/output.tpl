@@ -1,0 +1,4 @@
+before[!outputoff]
+hidden
+[!outputon]after
+[!outputproperties]
