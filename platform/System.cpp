@@ -20,33 +20,58 @@ FK_RESOURCESTRING(SOperationAborted, "Operation aborted");
 // UTF-8 and UTF-16
 //===----------------------------------------------------------------------===//
 
+char32_t DecodeUtf8(std::string_view Text, size_t& Pos) noexcept {
+  unsigned char C = static_cast<unsigned char>(Text[Pos]);
+  if (C < 0x80) {
+    ++Pos;
+    return C;
+  }
+  int Extra = (C >= 0xC2 && C < 0xE0) ? 1 : (C >= 0xE0 && C < 0xF0) ? 2 : (C >= 0xF0 && C < 0xF5) ? 3 : 0;
+  if (Extra == 0 || Pos + Extra >= Text.size()) {
+    ++Pos;
+    return 0xFFFD;
+  }
+  char32_t V = C & (0x3F >> Extra);
+  for (int K = 1; K <= Extra; ++K) {
+    unsigned char D = static_cast<unsigned char>(Text[Pos + K]);
+    if ((D & 0xC0) != 0x80) {
+      ++Pos;
+      return 0xFFFD;
+    }
+    V = (V << 6) | (D & 0x3F);
+  }
+  static constexpr char32_t MinFor[] = {0, 0x80, 0x800, 0x10000};
+  if (V < MinFor[Extra] || V > 0x10FFFF || (V >= 0xD800 && V <= 0xDFFF)) {
+    ++Pos;
+    return 0xFFFD;
+  }
+  Pos += Extra + 1;
+  return V;
+}
+
+void AppendUtf8(char32_t CP, String& Out) {
+  if (CP < 0x80) {
+    Out.push_back(static_cast<char>(CP));
+  } else if (CP < 0x800) {
+    Out.push_back(static_cast<char>(0xC0 | (CP >> 6)));
+    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
+  } else if (CP < 0x10000) {
+    Out.push_back(static_cast<char>(0xE0 | (CP >> 12)));
+    Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
+    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
+  } else {
+    Out.push_back(static_cast<char>(0xF0 | (CP >> 18)));
+    Out.push_back(static_cast<char>(0x80 | ((CP >> 12) & 0x3F)));
+    Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
+    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
+  }
+}
+
 WideString Utf8ToUtf16(std::string_view Text) {
   WideString Out;
   Out.reserve(Text.size());
-  size_t I = 0;
-  while (I < Text.size()) {
-    unsigned char C = static_cast<unsigned char>(Text[I]);
-    char32_t CP = 0xFFFD;
-    size_t Len = 1;
-    if (C < 0x80) {
-      CP = C;
-    } else {
-      int Extra = (C >= 0xF0 && C < 0xF5) ? 3 : (C >= 0xE0 && C < 0xF0) ? 2 : (C >= 0xC2 && C < 0xE0) ? 1 : -1;
-      if (Extra > 0 && I + Extra < Text.size()) {
-        char32_t V = C & (0x3F >> Extra);
-        bool Ok = true;
-        for (int K = 1; K <= Extra; ++K) {
-          unsigned char D = static_cast<unsigned char>(Text[I + K]);
-          if ((D & 0xC0) != 0x80) { Ok = false; break; }
-          V = (V << 6) | (D & 0x3F);
-        }
-        static const char32_t MinFor[] = {0, 0x80, 0x800, 0x10000};
-        if (Ok && V >= MinFor[Extra] && V <= 0x10FFFF && !(V >= 0xD800 && V <= 0xDFFF)) {
-          CP = V;
-          Len = Extra + 1;
-        }
-      }
-    }
+  for (size_t I = 0; I < Text.size();) {
+    char32_t CP = DecodeUtf8(Text, I);
     if (CP >= 0x10000) {
       CP -= 0x10000;
       Out.push_back(static_cast<char16_t>(0xD800 + (CP >> 10)));
@@ -54,7 +79,6 @@ WideString Utf8ToUtf16(std::string_view Text) {
     } else {
       Out.push_back(static_cast<char16_t>(CP));
     }
-    I += Len;
   }
   return Out;
 }
@@ -64,28 +88,13 @@ String Utf16ToUtf8(std::u16string_view Text) {
   Out.reserve(Text.size());
   for (size_t I = 0; I < Text.size(); ++I) {
     char32_t CP = Text[I];
-    if (CP >= 0xD800 && CP <= 0xDBFF && I + 1 < Text.size() && Text[I + 1] >= 0xDC00 &&
-        Text[I + 1] <= 0xDFFF) {
+    if (CP >= 0xD800 && CP <= 0xDBFF && I + 1 < Text.size() && Text[I + 1] >= 0xDC00 && Text[I + 1] <= 0xDFFF) {
       CP = 0x10000 + ((CP - 0xD800) << 10) + (Text[I + 1] - 0xDC00);
       ++I;
     } else if (CP >= 0xD800 && CP <= 0xDFFF) {
       CP = 0xFFFD;
     }
-    if (CP < 0x80) {
-      Out.push_back(static_cast<char>(CP));
-    } else if (CP < 0x800) {
-      Out.push_back(static_cast<char>(0xC0 | (CP >> 6)));
-      Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-    } else if (CP < 0x10000) {
-      Out.push_back(static_cast<char>(0xE0 | (CP >> 12)));
-      Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
-      Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-    } else {
-      Out.push_back(static_cast<char>(0xF0 | (CP >> 18)));
-      Out.push_back(static_cast<char>(0x80 | ((CP >> 12) & 0x3F)));
-      Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
-      Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-    }
+    AppendUtf8(CP, Out);
   }
   return Out;
 }

@@ -27,6 +27,11 @@ using String = std::string;
 /// UTF-16 text: only at wide boundaries (wide property kinds, character counts).
 using WideString = std::u16string;
 
+/// Decodes the code point at `Pos` and moves `Pos` past it; a malformed, overlong or
+/// truncated sequence gives U+FFFD and moves one byte.
+FK_API char32_t DecodeUtf8(std::string_view Text, size_t& Pos) noexcept;
+/// Appends the UTF-8 form of `CodePoint`.
+FK_API void AppendUtf8(char32_t CodePoint, String& Out);
 /// Converts UTF-8 to UTF-16; malformed bytes become U+FFFD.
 FK_API WideString Utf8ToUtf16(std::string_view Text);
 /// Converts UTF-16 to UTF-8; unpaired surrogates become U+FFFD.

@@ -89,55 +89,6 @@ char32_t FoldCodePoint(char32_t C) noexcept {
   return C;
 }
 
-/// Decodes one code point at `I` and moves past it; a malformed sequence yields
-/// U+FFFD and one byte.
-char32_t DecodeUtf8(std::string_view S, std::size_t& I) noexcept {
-  unsigned char C = static_cast<unsigned char>(S[I]);
-  if (C < 0x80) {
-    ++I;
-    return C;
-  }
-  int Extra = (C >= 0xC2 && C <= 0xDF) ? 1 : (C >= 0xE0 && C <= 0xEF) ? 2 : (C >= 0xF0 && C <= 0xF4) ? 3 : 0;
-  if (Extra == 0 || I + Extra >= S.size()) {
-    ++I;
-    return 0xFFFD;
-  }
-  char32_t V = C & (0x3F >> Extra);
-  for (int K = 1; K <= Extra; ++K) {
-    unsigned char D = static_cast<unsigned char>(S[I + K]);
-    if ((D & 0xC0) != 0x80) {
-      ++I;
-      return 0xFFFD;
-    }
-    V = (V << 6) | (D & 0x3F);
-  }
-  static constexpr char32_t MinFor[] = {0, 0x80, 0x800, 0x10000};
-  if (V < MinFor[Extra] || V > 0x10FFFF || (V >= 0xD800 && V <= 0xDFFF)) {
-    ++I;
-    return 0xFFFD;
-  }
-  I += Extra + 1;
-  return V;
-}
-
-void EncodeUtf8(char32_t CP, String& Out) {
-  if (CP < 0x80) {
-    Out.push_back(static_cast<char>(CP));
-  } else if (CP < 0x800) {
-    Out.push_back(static_cast<char>(0xC0 | (CP >> 6)));
-    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-  } else if (CP < 0x10000) {
-    Out.push_back(static_cast<char>(0xE0 | (CP >> 12)));
-    Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
-    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-  } else {
-    Out.push_back(static_cast<char>(0xF0 | (CP >> 18)));
-    Out.push_back(static_cast<char>(0x80 | ((CP >> 12) & 0x3F)));
-    Out.push_back(static_cast<char>(0x80 | ((CP >> 6) & 0x3F)));
-    Out.push_back(static_cast<char>(0x80 | (CP & 0x3F)));
-  }
-}
-
 bool IsAscii(std::string_view S) noexcept {
   for (char C : S)
     if (static_cast<unsigned char>(C) >= 0x80) return false;
@@ -154,7 +105,7 @@ inline std::uint8_t HashStep(std::uint8_t Sum, unsigned char C) noexcept {
 String CaseFold(std::string_view Text) {
   String Out;
   Out.reserve(Text.size());
-  for (std::size_t I = 0; I < Text.size();) EncodeUtf8(FoldCodePoint(DecodeUtf8(Text, I)), Out);
+  for (std::size_t I = 0; I < Text.size();) AppendUtf8(FoldCodePoint(DecodeUtf8(Text, I)), Out);
   return Out;
 }
 
