@@ -220,9 +220,12 @@ void TComponent::ChangeName(const String& NewName) {
 }
 
 void TComponent::ValidateRename(TComponent* Component, const String& CurName, const String& NewName) {
-  if (!Component || NewName.empty() || SameText(CurName, NewName)) return;
-  TComponent* Existing = FindComponent(NewName);
-  if (Existing && Existing != Component) throw EComponentError(SDuplicateName, NewName);
+  if (Component && !NewName.empty() && !SameText(CurName, NewName)) {
+    TComponent* Existing = FindComponent(NewName);
+    if (Existing && Existing != Component) throw EComponentError(SDuplicateName, NewName);
+  }
+  if (IsDesigning())
+    if (IPtr<IDesignerNotify> Designer = FindRootDesigner(this)) Designer->ValidateRename(Component, CurName, NewName);
 }
 
 void TComponent::Notification(TComponent* AComponent, TOperation Operation) {

@@ -76,6 +76,9 @@ struct FK_API IDesignerNotify : IInterface {
   FK_INTERFACE(IDesignerNotify, IInterface, "{B0F61B3E-5C1A-4C1E-9E63-3D2C6A0F4E01}")
   virtual void Modified() = 0;
   virtual void Notification(TPersistent* AnObject, TOperation Operation) = 0;
+  /// Asked before a component of the root (or, with `AComponent` null, the root itself)
+  /// changes its name; raises to refuse.
+  virtual void ValidateRename(TComponent* AComponent, const String& CurName, const String& NewName) = 0;
 };
 
 namespace detail {
@@ -143,7 +146,8 @@ class FK_API TComponent : public TPersistent, public IInterface {
   virtual void SetName(const String& NewName);
   /// Sets the name without validation or notification.
   void ChangeName(const String& NewName);
-  /// Checks a rename of `Component` (owned by this one) for duplicates.
+  /// Checks a rename of `Component` (owned by this one; null for this one's own name) for
+  /// duplicates; on a design surface the root's designer is asked too.
   virtual void ValidateRename(TComponent* Component, const String& CurName, const String& NewName);
 
   // Notifications -----------------------------------------------------------

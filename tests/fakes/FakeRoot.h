@@ -109,6 +109,9 @@ class TFakeRoot : public TInterfacedObject, public IInternalRoot, public IDesign
   // IDesigner: what designers and tool windows may ask
   void Modified() override { Record("Modified"); }
   void Notification(TPersistent*, TOperation) override {}
+  void ValidateRename(TComponent*, const String& CurName, const String& NewName) override {
+    Record("ValidateRename(" + CurName + "," + NewName + ")");
+  }
   void Activate() override { Record("Activate"); }
   TMethod CreateMethod(const String&, const TTypeData*) override { return {}; }
   TMethod CreateMethod(const String&, const IPtr<IEventInfo>&) override { return {}; }

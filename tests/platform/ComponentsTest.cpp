@@ -208,6 +208,11 @@ struct RecordingDesigner : TInterfacedObject, IDesignerNotify {
   FK_INTERFACES(IDesignerNotify)
   void Modified() override {}
   void Notification(TPersistent*, TOperation) override {}
+  void ValidateRename(TComponent* C, const String& CurName, const String& NewName) override {
+    Renames.push_back((C ? C->ClassName() : String("root")) + ":" + CurName + ">" + NewName);
+    if (NewName == "Refused") throw EComponentError("refused by the designer");
+  }
+  std::vector<String> Renames;
 };
 FK_IMPLEMENT(RecordingDesigner, "Tests") {}
 struct TDesignedRoot : TComponent {
@@ -242,6 +247,19 @@ TEST(Registry, RootDesignerAndNestedComponents) {
   RegisterNoIcon({TSampleWidget::StaticClass()});
   RegisterNoIconProc = nullptr;
   EXPECT_EQ(NoIcons, std::vector<TClass>{TSampleWidget::StaticClass()});
+
+  // On a design surface the designer is asked about every name, the root's included;
+  // off it, it is not.
+  auto* Designer = static_cast<RecordingDesigner*>(Root->Designer.Get());
+  Inner->SetName("Button2");
+  EXPECT_TRUE(Designer->Renames.empty());
+  Root->SetDesigning(true);
+  Inner->SetName("Button3");
+  Root->SetName("Form1");
+  EXPECT_THROW(Frame->SetName("Refused"), EComponentError);
+  EXPECT_EQ(Frame->Name(), "Frame1");
+  EXPECT_EQ(Designer->Renames, (std::vector<String>{"TSampleWidget:Button2>Button3", "root:>Form1",
+                                                   "TSampleWidget:Frame1>Refused"}));
   Root->Designer = nullptr;
   Loose->Destroy();
   Root->Destroy();
