@@ -17,8 +17,13 @@ struct IRoot;
 struct IInternalRoot;
 struct IComponentDesigner;
 struct IDesignerModule;
-struct IUpdateManager;
 struct IDatedStream;
+
+/// Ties a root component to its ancestor and its descendants; its operations join with
+/// the inheritance subsystem.
+struct FK_API IUpdateManager : IInterface {
+  FK_INTERFACE(IUpdateManager, IInterface, "{BE1E987D-8343-5DDB-BCF7-55D5397F2FBC}")
+};
 
 //===----------------------------------------------------------------------===//
 // Records and enumerations
@@ -45,9 +50,6 @@ FK_ENUM(TNotifyCode, std::uint8_t, ncModuleDeleted, ncModuleRenamed, ncEditorMod
 FK_ENUM(TDesignDialog, std::uint8_t, ddAlign, ddSize, ddScale, ddTabOrder, ddCreationOrder, ddSaveTemplate)
 FK_ENUM(TDesignCommand, std::uint8_t, dmAlignToGrid, dmFlipAllChildren, dmFlipSelectedChildren, dmTextLYT,
         dmViewAsText, dmRevert, dmShowNonVisualComponents)
-/// File open modes of the designers' file operations.
-inline constexpr int fmOpenRead = 64;
-inline constexpr int fmCreate = 65280;
 
 //===----------------------------------------------------------------------===//
 // The host
@@ -323,7 +325,8 @@ struct FK_API IInternalComponentDesigner : IComponentDesigner {
   virtual void UpdateRootDependents() = 0;
   virtual void UpdateSelections() = 0;
   // File operations, each with the file system's name first.
-  /// A stream of the file; `Mode` is `fmOpenRead` or `fmCreate`. The caller owns it.
+  /// A stream of the file; `Mode` is `fmOpenRead | fmShareDenyNone` (64) to read or
+  /// `fmCreate` (65280) to write. The caller owns it.
   virtual TStream* OpenFile(const String& FileSystem, const String& Name, int Mode) = 0;
   /// The file's age; -1 when unknown.
   virtual int GetFileAge(const String& FileSystem, const String& Name) = 0;

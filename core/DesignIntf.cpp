@@ -4,7 +4,6 @@
 namespace formkit {
 
 FK_RESOURCESTRING(SInvalidMethodData, "Invalid method type data");
-FK_RESOURCESTRING(SListIndexError, "List index out of bounds (%d)");
 
 bool GReferenceExpandable = true;
 bool GShowReadOnlyProps = true;

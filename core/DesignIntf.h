@@ -306,7 +306,7 @@ struct FK_API IImplementation : IInterface {
 };
 /// The alignment guidelines a component offers.
 struct FK_API IComponentGuidelines : IInterface {
-  FK_INTERFACE(IComponentGuidelines, IInterface, "{B370D0A2-EEB8-5BFA-ADDC-EC93D1AD9877}")
+  FK_INTERFACE(IComponentGuidelines, IInterface, "{237413D7-F6B8-4B8D-B581-3CDC320CE854}")
   virtual int GetCount() = 0;
   virtual TDesignerGuideType GetDesignerGuideType(int Index) = 0;
   virtual int GetDesignerGuideOffset(int Index) = 0;

@@ -9,7 +9,6 @@ namespace formkit {
 FK_RESOURCESTRING(SAssignError, "Cannot assign a %s to a %s");
 FK_RESOURCESTRING(SInvalidName, "'%s' is not a valid component name");
 FK_RESOURCESTRING(SDuplicateName, "A component named %s already exists");
-FK_RESOURCESTRING(SListIndexError, "List index out of bounds (%d)");
 FK_RESOURCESTRING(SDanglingReference, "Instance of Class %s has dangling reference count of %d");
 FK_RESOURCESTRING(SNotAComponentClass, "Class %s is not a component class");
 

@@ -36,6 +36,13 @@ FK_EXCEPTION(EInvalidProperty, EFilerError);
 
 FK_EVENT(TNotifyEvent, void(TObject* Sender));
 
+/// The keys and buttons held during a mouse or key event.
+FK_ENUM(TShiftStateFlag, std::uint8_t, ssShift, ssAlt, ssCtrl, ssLeft, ssRight, ssMiddle, ssDouble)
+FK_SET(TShiftState, TShiftStateFlag)
+
+/// The message of every list's index error.
+FK_RESOURCESTRING(SListIndexError, "List index out of bounds (%d)");
+
 //===----------------------------------------------------------------------===//
 // TPersistent
 //===----------------------------------------------------------------------===//

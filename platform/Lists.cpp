@@ -5,7 +5,6 @@
 
 namespace formkit {
 
-FK_RESOURCESTRING(SListIndexError, "List index out of bounds (%d)");
 FK_RESOURCESTRING(SDuplicateString, "String list does not allow duplicates");
 FK_RESOURCESTRING(SSortedListError, "Operation not allowed on sorted list");
 

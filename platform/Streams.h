@@ -136,6 +136,8 @@ enum : std::uint16_t {
   fmOpenRead = 0x0000,
   fmOpenWrite = 0x0001,
   fmOpenReadWrite = 0x0002,
+  /// Others may read and write the file meanwhile.
+  fmShareDenyNone = 0x0040,
   fmCreate = 0xFF00,
 };
 

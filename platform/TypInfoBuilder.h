@@ -24,7 +24,7 @@ template <class V> struct IsEventPtr {
 template <class V> struct IsIPtr : std::false_type {};
 template <class I> struct IsIPtr<IPtr<I>> : std::true_type {};
 template <class V> struct IsSet : std::false_type {};
-template <class E> struct IsSet<TSet<E>> : std::true_type {};
+template <class E, class S> struct IsSet<TSet<E, S>> : std::true_type {};
 
 template <class V> constexpr TValueSlot SlotOf() {
   if constexpr (std::is_integral_v<V> || std::is_enum_v<V> || IsSet<V>::value ||
