@@ -744,6 +744,8 @@ TComponent* TReader::ReadComponent(TComponent* Component) {
       if (!Result) Result = CreateComponent(Class, FOwner);
       FState->Loaded.push_back({Result, true});
       if (Flags.Contains(ffInline)) Result->SetInline(true);
+      // Loading before the name: what follows the name (a caption) must not react to it.
+      Result->SetLoading(true);
       String NewName = Name;
       if (OnSetName) OnSetName(this, Result, NewName);
       if (!NewName.empty() && !IsValidIdent(NewName)) throw EReadError(SInvalidComponentName, NewName);

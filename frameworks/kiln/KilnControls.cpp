@@ -1,0 +1,494 @@
+//===- frameworks/kiln/KilnControls.cpp - Controls and windowed controls -===//
+#include "frameworks/kiln/KilnControls.h"
+
+#include "platform/Filer.h"
+
+#include <algorithm>
+
+namespace formkit {
+
+FK_RESOURCESTRING(SControlParentSelf, "Control '%s' cannot be its own parent");
+FK_RESOURCESTRING(SControlParentChild, "Control '%s' cannot be parented to '%s', which lies inside it");
+FK_RESOURCESTRING(SControlNotWindowed, "Control '%s' cannot hold '%s': only a windowed control holds children");
+FK_RESOURCESTRING(SControlNotChild, "Control '%s' is not a child of '%s'");
+FK_RESOURCESTRING(SControlNotParent, "'%s' is not a parent of control '%s'");
+FK_RESOURCESTRING(SControlIndexError, "Control index out of bounds (%d)");
+FK_RESOURCESTRING(SInvalidPPI, "%d is not a valid number of pixels per inch");
+
+std::function<int(const TControl*)> ControlPPIHook;
+
+namespace detail {
+/// A name for messages: the control's name, or its class name when it has none.
+String DisplayName(const TComponent* C) {
+  if (!C) return "(none)";
+  return C->Name().empty() ? C->ClassName() : C->Name();
+}
+} // namespace detail
+
+//===----------------------------------------------------------------------===//
+// TControl
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TControl, "KilnControls") {
+  auto SizeStored = +[](TObject* O) { return static_cast<TControl*>(O)->IsSizeStored(); };
+  B.Property("Left", &TControl::Left, &TControl::SetLeft);
+  B.Property("Top", &TControl::Top, &TControl::SetTop);
+  B.Property("Width", &TControl::Width, &TControl::SetWidth).Stored(SizeStored);
+  B.Property("Height", &TControl::Height, &TControl::SetHeight).Stored(SizeStored);
+  B.Property("Cursor", &TControl::Cursor, &TControl::SetCursor).Type(&TypeInfo_TCursor).Default(crDefault);
+  B.Property("Hint", &TControl::Hint, &TControl::SetHint);
+}
+
+void TControl::Create(TComponent* AOwner) {
+  inherited::Create(AOwner);
+  FFont = new TFont;
+  FFont->OnChange = TNotifyEvent::Bind<&TControl::FontChangedHandler>(this);
+}
+
+void TControl::BeforeDestruction() {
+  // Leave the parent while this control and the parent are whole.
+  if (FParent) SetParent(nullptr);
+  FreeAndNil(FFont);
+  // Last: nothing queued for this control may be delivered once it is gone.
+  RemoveMessages(this);
+  inherited::BeforeDestruction();
+}
+
+void TControl::SetBounds(int ALeft, int ATop, int AWidth, int AHeight) {
+  AWidth = std::max(AWidth, 0);
+  AHeight = std::max(AHeight, 0);
+  if (ALeft == FLeft && ATop == FTop && AWidth == FWidth && AHeight == FHeight) return;
+  UpdateBounds(ALeft, ATop, AWidth, AHeight);
+  RequestAlign();
+}
+
+void TControl::UpdateBounds(int ALeft, int ATop, int AWidth, int AHeight) {
+  AWidth = std::max(AWidth, 0);
+  AHeight = std::max(AHeight, 0);
+  bool Sized = AWidth != FWidth || AHeight != FHeight;
+  FLeft = ALeft;
+  FTop = ATop;
+  FWidth = AWidth;
+  FHeight = AHeight;
+  if (Sized) Resized();
+}
+
+void TControl::RequestAlign() {
+  if (FParent && FAlign != alNone) FParent->Realign();
+}
+
+void TControl::SetClientWidth(int Value) { SetWidth(Value + (FWidth - ClientWidth())); }
+
+void TControl::SetClientHeight(int Value) { SetHeight(Value + (FHeight - ClientHeight())); }
+
+TPoint TControl::ClientOrigin() const {
+  TPoint P{0, 0};
+  for (const TControl* C = this; C; C = C->FParent) {
+    TPoint Off = C->ClientOffset();
+    P.X += C->FLeft + Off.X;
+    P.Y += C->FTop + Off.Y;
+  }
+  return P;
+}
+
+TPoint TControl::ClientToScreen(TPoint P) const {
+  TPoint O = ClientOrigin();
+  return {P.X + O.X, P.Y + O.Y};
+}
+
+TPoint TControl::ScreenToClient(TPoint P) const {
+  TPoint O = ClientOrigin();
+  return {P.X - O.X, P.Y - O.Y};
+}
+
+TPoint TControl::ClientToParent(TPoint P, const TWinControl* AParent) const {
+  const TControl* C = this;
+  for (; C && C != AParent; C = C->FParent) {
+    TPoint Off = C->ClientOffset();
+    P.X += C->FLeft + Off.X;
+    P.Y += C->FTop + Off.Y;
+  }
+  if (!C) throw EInvalidOperation(SControlNotParent, detail::DisplayName(AParent), detail::DisplayName(this));
+  return P;
+}
+
+TPoint TControl::ParentToClient(TPoint P, const TWinControl* AParent) const {
+  TPoint Zero = ClientToParent({0, 0}, AParent);
+  return {P.X - Zero.X, P.Y - Zero.Y};
+}
+
+bool TControl::HasAncestor(const TControl* Other) const noexcept {
+  for (const TControl* C = this; C; C = C->FParent)
+    if (C == Other) return true;
+  return false;
+}
+
+void TControl::SetParent(TWinControl* Value) {
+  if (Value == FParent) return;
+  if (Value == this) throw EInvalidOperation(SControlParentSelf, detail::DisplayName(this));
+  if (Value && Value->HasAncestor(this))
+    throw EInvalidOperation(SControlParentChild, detail::DisplayName(this), detail::DisplayName(Value));
+  TWinControl* Old = FParent;
+  if (Old) Old->Detach(this);
+  if (Value) Value->Attach(this);
+  if (FParentFont && FParent) {
+    FTakingParentFont = true;
+    FFont->Assign(FParent->Font());
+    FTakingParentFont = false;
+  }
+  if (Old) Old->Perform(CM_CONTROLCHANGE, reinterpret_cast<std::intptr_t>(this), 0);
+  if (Value) Value->Perform(CM_CONTROLCHANGE, reinterpret_cast<std::intptr_t>(this), 1);
+  Perform(CM_PARENTCHANGED, reinterpret_cast<std::intptr_t>(Old), reinterpret_cast<std::intptr_t>(Value));
+}
+
+bool TControl::Showing() const noexcept {
+  for (const TControl* C = this; C; C = C->FParent)
+    if (!C->FVisible) return false;
+  return true;
+}
+
+void TControl::SetVisible(bool Value) {
+  if (FVisible == Value) return;
+  FVisible = Value;
+  RequestAlign();
+  Perform(CM_VISIBLECHANGED, Value ? 1 : 0);
+}
+
+void TControl::SetEnabled(bool Value) {
+  if (FEnabled == Value) return;
+  FEnabled = Value;
+  Perform(CM_ENABLEDCHANGED);
+}
+
+void TControl::SetAlign(TAlign Value) {
+  if (FAlign == Value) return;
+  FAlign = Value;
+  if (FParent) FParent->Realign();
+}
+
+void TControl::SetText(const String& Value) {
+  if (FText == Value) return;
+  FText = Value;
+  Perform(CM_TEXTCHANGED);
+}
+
+void TControl::SetColor(TColor Value) {
+  if (FColor == Value) return;
+  FColor = Value;
+  Perform(CM_COLORCHANGED);
+}
+
+void TControl::SetParentFont(bool Value) {
+  FParentFont = Value;
+  if (Value && FParent) {
+    FTakingParentFont = true;
+    try {
+      FFont->Assign(FParent->Font());
+    } catch (...) {
+      FTakingParentFont = false;
+      throw;
+    }
+    FTakingParentFont = false;
+  }
+}
+
+void TControl::FontChangedHandler(TObject*) {
+  // A font set on the control itself is its own from now on; one copied from the
+  // parent is not.
+  if (!FTakingParentFont) FParentFont = false;
+  Perform(CM_FONTCHANGED);
+}
+
+int TControl::CurrentPPI() const {
+  if (ControlPPIHook) {
+    int V = ControlPPIHook(this);
+    if (V > 0) return V;
+  }
+  return FPPI;
+}
+
+void TControl::ScaleForPPI(int NewPPI) {
+  if (NewPPI <= 0) throw EInvalidOperation(SInvalidPPI, NewPPI);
+  if (NewPPI == FPPI) return;
+  ChangeScale(NewPPI, FPPI, NewPPI);
+}
+
+void TControl::ChangeScale(int M, int D, int NewPPI) {
+  FPPI = NewPPI;
+  SetBounds(MulDiv(FLeft, M, D), MulDiv(FTop, M, D), MulDiv(FWidth, M, D), MulDiv(FHeight, M, D));
+}
+
+void TControl::SetOwnPPI(int Value) {
+  if (Value <= 0) throw EInvalidOperation(SInvalidPPI, Value);
+  FPPI = Value;
+}
+
+void TControl::Click() {
+  if (OnClick && !IsDesigning()) OnClick(this);
+}
+
+void TControl::WndProc(TMessage& Message) {
+  switch (Message.Msg) {
+  case CM_FONTCHANGED: FontChanged(); break;
+  case CM_TEXTCHANGED: TextChanged(); break;
+  default: break;
+  }
+}
+
+TComponent* TControl::GetParentComponent() { return FParent; }
+
+void TControl::SetParentComponent(TComponent* AParent) {
+  if (auto* W = dynamic_cast<TWinControl*>(AParent)) {
+    SetParent(W);
+    return;
+  }
+  // A control read under a non-visual root stays without a parent; under another kind
+  // of control it cannot stand.
+  if (dynamic_cast<TControl*>(AParent))
+    throw EInvalidOperation(SControlNotWindowed, detail::DisplayName(AParent), detail::DisplayName(this));
+  SetParent(nullptr);
+}
+
+void TControl::SetName(const String& NewName) {
+  String OldName = Name();
+  TComponent* Own = Owner();
+  bool Follow = FControlStyle.Contains(csSetCaption) && FText == OldName && !IsLoading() &&
+                !(Own && Own->ComponentState().Contains(csLoading));
+  inherited::SetName(NewName);
+  if (Follow) SetText(NewName);
+}
+
+//===----------------------------------------------------------------------===//
+// TWinControl
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TWinControl, "KilnControls") {}
+
+void TWinControl::BeforeDestruction() {
+  // A windowed control takes its children with it, whoever owns them; each leaves its
+  // owner in its own teardown.
+  while (!FControls.empty()) FControls.back()->Destroy();
+  inherited::BeforeDestruction();
+}
+
+TControl* TWinControl::Controls(int Index) const {
+  if (Index < 0 || Index >= ControlCount()) throw EListError(SControlIndexError, Index);
+  return FControls[static_cast<std::size_t>(Index)];
+}
+
+int TWinControl::IndexOfControl(const TControl* Control) const noexcept {
+  auto It = std::find(FControls.begin(), FControls.end(), Control);
+  return It == FControls.end() ? -1 : static_cast<int>(It - FControls.begin());
+}
+
+void TWinControl::InsertControl(TControl* AControl) {
+  if (!AControl) throw EInvalidOperation(SControlNotChild, "(none)", detail::DisplayName(this));
+  AControl->SetParent(this);
+}
+
+void TWinControl::RemoveControl(TControl* AControl) {
+  if (!AControl || AControl->FParent != this)
+    throw EInvalidOperation(SControlNotChild, detail::DisplayName(AControl), detail::DisplayName(this));
+  AControl->SetParent(nullptr);
+}
+
+void TWinControl::Attach(TControl* Child) {
+  FControls.reserve(FControls.size() + 1);
+  auto* W = dynamic_cast<TWinControl*>(Child);
+  if (W) FTabList.reserve(FTabList.size() + 1);
+  // Nothing below allocates: the lists stay consistent.
+  FControls.push_back(Child);
+  Child->FParent = this;
+  if (!W) return;
+  FTabList.push_back(W);
+  if (W->FPendingTabOrder >= 0) {
+    int Pending = std::exchange(W->FPendingTabOrder, -1);
+    W->SetTabOrder(Pending);
+  }
+}
+
+void TWinControl::Detach(TControl* Child) noexcept {
+  std::erase(FControls, Child);
+  if (auto* W = dynamic_cast<TWinControl*>(Child)) std::erase(FTabList, W);
+  Child->FParent = nullptr;
+}
+
+TControl* TWinControl::ControlAtPos(TPoint Pos, bool AllowDisabled, bool AllowWinControls, bool AllLevels) const {
+  for (std::size_t I = FControls.size(); I-- > 0;) {
+    TControl* C = FControls[I];
+    auto* W = dynamic_cast<TWinControl*>(C);
+    if (W && !AllowWinControls) continue;
+    bool Visible = C->Visible() || (C->IsDesigning() && !C->ControlStyle().Contains(csNoDesignVisible));
+    if (!Visible || (!C->Enabled() && !AllowDisabled)) continue;
+    if (!C->BoundsRect().Contains(Pos)) continue;
+    if (AllLevels && W) {
+      TPoint Off = W->ClientOffset();
+      if (TControl* Inner = W->ControlAtPos({Pos.X - W->Left() - Off.X, Pos.Y - W->Top() - Off.Y}, AllowDisabled,
+                                            AllowWinControls, true))
+        return Inner;
+    }
+    return C;
+  }
+  return nullptr;
+}
+
+void TWinControl::SetChildZOrder(TControl* Child, int Position) {
+  int Index = IndexOfControl(Child);
+  if (Index < 0) throw EInvalidOperation(SControlNotChild, detail::DisplayName(Child), detail::DisplayName(this));
+  Position = std::clamp(Position, 0, ControlCount() - 1);
+  if (Position == Index) return;
+  FControls.erase(FControls.begin() + Index);
+  FControls.insert(FControls.begin() + Position, Child);
+  // Among aligned children of one kind, ties are broken by this order.
+  if (Child->Align() != alNone) Realign();
+}
+
+int TWinControl::TabOrder() const noexcept {
+  if (!FParent) return -1;
+  const auto& L = FParent->FTabList;
+  auto It = std::find(L.begin(), L.end(), this);
+  return It == L.end() ? -1 : static_cast<int>(It - L.begin());
+}
+
+void TWinControl::SetTabOrder(int Value) {
+  if (!FParent) {
+    FPendingTabOrder = Value;
+    return;
+  }
+  auto& L = FParent->FTabList;
+  auto It = std::find(L.begin(), L.end(), this);
+  if (It == L.end()) return;
+  L.erase(It);
+  Value = std::clamp(Value, 0, static_cast<int>(L.size()));
+  L.insert(L.begin() + Value, this);
+}
+
+void TWinControl::Realign() {
+  if (FAlignLevel > 0 || FAligning || IsLoading() || ComponentState().Contains(csDestroying)) return;
+  FAligning = true;
+  try {
+    AlignControls();
+  } catch (...) {
+    FAligning = false;
+    throw;
+  }
+  FAligning = false;
+}
+
+void TWinControl::EnableAlign() {
+  if (FAlignLevel > 0 && --FAlignLevel == 0) Realign();
+}
+
+void TWinControl::AlignControls() {
+  TRect R = AlignRect();
+  std::vector<TControl*> Group;
+  for (TAlign A : {alTop, alBottom, alLeft, alRight, alClient}) {
+    Group.clear();
+    for (TControl* C : FControls) {
+      if (C->Align() != A) continue;
+      if (!C->Visible() && !(C->IsDesigning() && !C->ControlStyle().Contains(csNoDesignVisible))) continue;
+      Group.push_back(C);
+    }
+    // Controls of one edge keep the order in which they stand along it.
+    std::stable_sort(Group.begin(), Group.end(), [A](TControl* X, TControl* Y) {
+      switch (A) {
+      case alTop: return X->Top() < Y->Top();
+      case alBottom: return X->Top() + X->Height() > Y->Top() + Y->Height();
+      case alLeft: return X->Left() < Y->Left();
+      case alRight: return X->Left() + X->Width() > Y->Left() + Y->Width();
+      default: return false;
+      }
+    });
+    for (TControl* C : Group) {
+      int W = C->Width();
+      int H = C->Height();
+      switch (A) {
+      case alTop:
+        C->UpdateBounds(R.Left, R.Top, std::max(R.Width(), 0), H);
+        R.Top += H;
+        break;
+      case alBottom:
+        C->UpdateBounds(R.Left, R.Bottom - H, std::max(R.Width(), 0), H);
+        R.Bottom -= H;
+        break;
+      case alLeft:
+        C->UpdateBounds(R.Left, R.Top, W, std::max(R.Height(), 0));
+        R.Left += W;
+        break;
+      case alRight:
+        C->UpdateBounds(R.Right - W, R.Top, W, std::max(R.Height(), 0));
+        R.Right -= W;
+        break;
+      default: C->UpdateBounds(R.Left, R.Top, std::max(R.Width(), 0), std::max(R.Height(), 0)); break;
+      }
+    }
+  }
+}
+
+void TWinControl::ChangeScale(int M, int D, int NewPPI) {
+  // The children are laid out once, at the end, from their scaled bounds.
+  DisableAlign();
+  try {
+    inherited::ChangeScale(M, D, NewPPI);
+    for (TControl* C : std::vector<TControl*>(FControls)) C->ChangeScale(M, D, NewPPI);
+  } catch (...) {
+    --FAlignLevel;
+    throw;
+  }
+  EnableAlign();
+}
+
+void TWinControl::ControlChange(TControl* Child, bool) {
+  if (Child->Align() != alNone) Realign();
+}
+
+void TWinControl::WndProc(TMessage& Message) {
+  if (Message.Msg == CM_CONTROLCHANGE) {
+    ControlChange(reinterpret_cast<TControl*>(Message.WParam), Message.LParam != 0);
+    return;
+  }
+  inherited::WndProc(Message);
+}
+
+void TWinControl::Resized() {
+  inherited::Resized();
+  Realign();
+}
+
+void TWinControl::FontChanged() {
+  inherited::FontChanged();
+  for (TControl* C : std::vector<TControl*>(FControls))
+    if (C->ParentFont()) C->SetParentFont(true);
+}
+
+void TWinControl::GetChildren(const TGetChildProc& Proc, TComponent* Root) {
+  for (TControl* C : std::vector<TControl*>(FControls))
+    if (C->Owner() == Root) Proc(C);
+}
+
+void TWinControl::SetChildOrder(TComponent* Child, int Order) {
+  auto* C = dynamic_cast<TControl*>(Child);
+  if (C && C->FParent == this) SetChildZOrder(C, Order);
+}
+
+void TWinControl::Loaded() {
+  inherited::Loaded();
+  Realign();
+}
+
+//===----------------------------------------------------------------------===//
+// Painted controls
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TGraphicControl, "KilnControls") {}
+
+void TGraphicControl::Paint(TCanvas*) {}
+
+FK_IMPLEMENT(TCustomControl, "KilnControls") {}
+
+void TCustomControl::Paint(TCanvas* Canvas) {
+  Canvas->Brush()->SetColor(Color());
+  Canvas->FillRect(ClientRect());
+}
+
+} // namespace formkit
