@@ -9,15 +9,20 @@
 #pragma once
 
 #include "core/DesignIntf.h"
+#include "platform/Streams.h"
 
 namespace formkit {
 
-class TStream;
 struct IRoot;
 struct IInternalRoot;
 struct IComponentDesigner;
 struct IDesignerModule;
-struct IDatedStream;
+
+/// A stream of the host with the age of its content (-1 when no age is known).
+struct FK_API IDatedStream : IStream {
+  FK_INTERFACE(IDatedStream, IStream, "{69CD3924-F029-536A-9165-992E84486640}")
+  virtual int GetModifyTime() = 0;
+};
 
 /// Ties a root component to its ancestor and its descendants; its operations join with
 /// the inheritance subsystem.

@@ -288,10 +288,6 @@ template <class T, class... A> IPtr<T> New(A&&... Args) {
   return IPtr<T>::Adopt(P);
 }
 
-/// Creates a counted object and returns it as interface `I`.
-template <class I, class T, class... A> IPtr<I> NewAs(A&&... Args) {
-  return IPtr<I>(New<T>(std::forward<A>(Args)...));
-}
 
 /// True when the object answers to `I`; does not touch the count.
 template <class I> bool Supports(const TObject* Obj) {
@@ -313,6 +309,14 @@ template <class I> IPtr<I> InterfaceOf(TObject* Obj) {
   IPtr<I> R;
   Supports(Obj, R);
   return R;
+}
+
+/// Creates a counted object and returns it as interface `I`. Where `T` has `I` more than
+/// once (several interfaces of one family), the object is asked for it instead.
+template <class I, class T, class... A> IPtr<I> NewAs(A&&... Args) {
+  IPtr<T> Obj = New<T>(std::forward<A>(Args)...);
+  if constexpr (std::is_convertible_v<T*, I*>) return IPtr<I>(std::move(Obj));
+  else return InterfaceOf<I>(Obj.Get());
 }
 
 

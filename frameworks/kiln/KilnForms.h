@@ -34,10 +34,29 @@ inline constexpr int FormCaptionHeight = 23;
 // Forms
 //===----------------------------------------------------------------------===//
 
+/// What makes a class a root that a designer can hold: an uncounted link to the
+/// designer (the designer owns the root, not the other way round), which
+/// `FindRootDesigner` finds, and the root's notifications of its components passed on
+/// to it, so the designer hears of every component that comes and goes.
+template <class Base> class TDesignableRoot : public Base {
+public:
+  /// Links the designer; null unlinks. Does not take a reference.
+  void SetDesigner(IDesignerNotify* Designer) noexcept { FDesigner = Designer; }
+  IPtr<IDesignerNotify> GetDesigner() override { return IPtr<IDesignerNotify>(FDesigner); }
+  void Notification(TComponent* AComponent, TOperation Operation) override {
+    Base::Notification(AComponent, Operation);
+    if (FDesigner && AComponent != this && !this->ComponentState().Contains(csDestroying))
+      FDesigner->Notification(AComponent, Operation);
+  }
+
+private:
+  IDesignerNotify* FDesigner = nullptr;
+};
+
 /// A top-level window. It starts hidden; its client area lies inside a frame and below
 /// a caption unless its border style is `bsNone`. It streams its client size.
-class FK_API TCustomForm : public TWinControl {
-  FK_CLASS(TCustomForm, TWinControl)
+class FK_API TCustomForm : public TDesignableRoot<TWinControl> {
+  FK_CLASS(TCustomForm, TDesignableRoot<TWinControl>)
 
   void Create(TComponent* AOwner) override;
   void BeforeDestruction() override;
@@ -97,8 +116,8 @@ class FK_API TForm : public TCustomForm {
 //===----------------------------------------------------------------------===//
 
 /// A windowed control that is a root of its own and can stand nested in another root.
-class FK_API TCustomFrame : public TWinControl {
-  FK_CLASS(TCustomFrame, TWinControl)
+class FK_API TCustomFrame : public TDesignableRoot<TWinControl> {
+  FK_CLASS(TCustomFrame, TDesignableRoot<TWinControl>)
   void Create(TComponent* AOwner) override;
   /// As a root (or nested root), the non-visual components it owns follow its controls.
   void GetChildren(const TGetChildProc& Proc, TComponent* Root) override;
@@ -116,8 +135,8 @@ class FK_API TFrame : public TCustomFrame {
 /// A root of non-visual components. It has no bounds; it remembers the size, scroll
 /// offset and pixels per inch of its design window, streamed as "Height", "Width",
 /// "HorizontalOffset", "VerticalOffset" and "PixelsPerInch".
-class FK_API TDataModule : public TComponent {
-  FK_CLASS(TDataModule, TComponent)
+class FK_API TDataModule : public TDesignableRoot<TComponent> {
+  FK_CLASS(TDataModule, TDesignableRoot<TComponent>)
 
   TPoint DesignSize() const noexcept { return FDesignSize; }
   void SetDesignSize(TPoint Value) noexcept { FDesignSize = Value; }

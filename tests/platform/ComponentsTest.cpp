@@ -1,22 +1,14 @@
 //===- tests/platform/ComponentsTest.cpp - Components, owners, registry --===//
 #include "tests/platform/SampleComponents.h"
 #include "platform/Lists.h"
+#include "tests/fakes/Messages.h"
 
 #include <gtest/gtest.h>
 
 using namespace formkit;
 using namespace formkit::sample;
+using formkit::fakes::MessageOf;
 
-namespace {
-template <class E, class F> String MessageOf(F&& Call) {
-  try {
-    Call();
-  } catch (const E& Error) {
-    return Error.Message();
-  }
-  return "<no exception>";
-}
-} // namespace
 
 TEST(Construction, FlagsSetBetweenNewInstanceAndCreateAreSeenByTheConstructor) {
   TClass C = TSampleWidget::StaticClass();

@@ -1,0 +1,351 @@
+//===- core/root/ComponentRoot.h - One module on design ------------------===//
+//
+// `TComponentRoot` holds one module on design: the host's module record, the
+// root component and everything it owns, the surface that shows it, its
+// selection and its streams. It is the base of a framework's concrete root,
+// which gives the window, the surface and the framework's answers through the
+// abstract operations, and which the framework's designer creates:
+//
+//   IPtr<TKilnRoot> Root = New<TKilnRoot>();
+//   Root->Create({Designer, Module, "Unit1.kfm", false, nullptr, "Form1"});
+//   Root->Show();
+//   Root->Close();     // leaves the designer's list; the object goes with its last reference
+//
+// The themes live in their own files: lifecycle and state (ComponentRoot.cpp),
+// selection and instances (RootSelection.cpp), creation (RootCreation.cpp),
+// names (RootNames.cpp), the designer interface's forwards (RootDesigner.cpp).
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include "core/DesignerTypes.h"
+#include "core/root/ComponentDesignSurface.h"
+#include "core/root/RootHooks.h"
+#include "platform/Streams.h"
+
+namespace formkit {
+
+FK_EXCEPTION(ECannotDeleteNonComponentException, EComponentDesignerException);
+
+FK_RESOURCESTRING(sRootClassNotFound, "Root class not found: \"%s\"");
+FK_RESOURCESTRING(sReadOnlySource, "Source is read-only");
+FK_RESOURCESTRING(sCannotInherit,
+                  "Component class '%s' does not support inheritance and cannot be added to a module that has descendents");
+FK_RESOURCESTRING(sCannotCreateComponentOnView, "This component can only be created on the Master View");
+FK_RESOURCESTRING(sRenamingAncestor, "Cannot rename component %s, component was introduced in an ancestor form");
+FK_RESOURCESTRING(sComponentAlreadyExists, "A component named %s already exists in a descendant module");
+FK_RESOURCESTRING(sRootMustHaveName, "Root component must have a name");
+FK_RESOURCESTRING(sAncestorClassName, "Cannot rename a module to the same name as one of its ancestors (%s)");
+FK_RESOURCESTRING(sServiceNotAvailable, "%s is not available");
+
+/// A palette entry that can make its component.
+struct FK_API IInternalPaletteItem : IInterface {
+  FK_INTERFACE(IInternalPaletteItem, IInterface, "{F9D448F1-50BC-11D1-9FB5-0020AF3D82DA}")
+  /// Makes the component in `Owner` under `Parent`; null ends the creation silently.
+  virtual TComponent* CreateComponent(TComponent* Owner, TComponent* Parent, const IPtr<IDesignerModule>& Module,
+                                      const TRect& Rect) = 0;
+};
+
+/// The bridge from a class to the palette-item path: constructs the class with `Owner`.
+class FK_API TClassPaletteItem : public TInterfacedObject, public IInternalPaletteItem {
+  FK_CLASS(TClassPaletteItem, TInterfacedObject)
+  FK_INTERFACES(IInternalPaletteItem)
+  explicit TClassPaletteItem(TClass ComponentClass = nullptr) : FComponentClass(ComponentClass) {}
+  TComponent* CreateComponent(TComponent* Owner, TComponent*, const IPtr<IDesignerModule>&, const TRect&) override {
+    return formkit::CreateComponent(FComponentClass, Owner);
+  }
+
+private:
+  TClass FComponentClass;
+};
+
+/// The root's view of its selection: persistents where the surface speaks of items. It
+/// listens to the surface's list without being kept alive by it.
+class FK_API TSelections : public TInterfacedObject, public ISelectionsListener {
+  FK_CLASS(TSelections, TInterfacedObject)
+  FK_INTERFACES(ISelectionsListener)
+  explicit TSelections(const IPtr<ISelections>& Selections = nullptr);
+  void BeforeDestruction() override;
+
+  int GetCount() { return FSelections ? FSelections->GetCount() : 0; }
+  TPersistent* GetPersistents(int Index);
+  /// The first item whose persistent is `Instance`, or null.
+  IPtr<IItem> FindItemFor(TPersistent* Instance);
+  void SelectionChanged(const IPtr<ISelections>& Selections) override;
+  const IPtr<ISelections>& Items() const noexcept { return FSelections; }
+
+  std::function<void()> FOnChanged;
+
+private:
+  IPtr<ISelections> FSelections;
+};
+
+/// One module on design. See the file comment.
+class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, public IDesigner {
+  FK_CLASS(TComponentRoot, TInterfacedObject)
+  FK_INTERFACES(IInternalRoot, IDesigner)
+
+  /// What a module on design is made from.
+  struct TCreateArgs {
+    IPtr<IComponentDesigner> Designer;
+    IPtr<IDesignerModule> Module;
+    String FileName;
+    bool Existing = false;
+    IPtr<IDatedStream> Stream;
+    String FormName;
+    String AncestorName;
+    String FileSystem;
+    IPtr<IRoot> AncestorRoot;
+    String ViewName;
+  };
+
+  /// The constructor logic: joins the designer's list, makes or reads the module, opens
+  /// the designer. A failure leaves the designer's list as it was and passes on.
+  virtual void Create(const TCreateArgs& Args);
+  void BeforeDestruction() override;
+
+  // Fields the framework's root reads -------------------------------------------------
+  TComponent* Root() const noexcept { return FRoot; }
+  const IPtr<IComponentDesignSurface>& Surface() const noexcept { return FSurface; }
+  const IPtr<ISurfaceDesigner>& SurfaceDesigner() const noexcept { return FSurfaceDesigner; }
+  /// The surface-level selection list the root created; the surface and engine share it.
+  IPtr<ISelections> SelectionItems() const { return FSelections ? FSelections->Items() : nullptr; }
+  int ModifyTime() const noexcept { return FModifyTime; }
+  bool IsClosing() const noexcept { return FClosing; }
+  IPtr<IDesigner> AsDesigner() { return IPtr<IDesigner>(static_cast<IDesigner*>(this)); }
+  /// Whether `Component` is a nested frame whose insides this module may change.
+  bool ModifiableFrame(TComponent* Component) const { return IsModifiableFrame(Component); }
+  IPtr<IRoot> AsRoot() { return IPtr<IRoot>(static_cast<IInternalRoot*>(this)); }
+
+  // Lifecycle and state (Part of this unit) ---------------------------------------------
+  TClass GetRootClass() override;
+  String GetDesignClassName();
+  String GetAncestorName();
+  String GetRootClassName() override;
+  String GetRootName() override;
+  void SetRootName(const String& Name);
+  void Modified() override;
+  void ModifiedUpdateNotification() override;
+  void UpdateOptions() override;
+  void Show() override;
+  void ShowAs(TShowState State);
+  void Hide() override;
+  void Close() override;
+  void SetActive(bool Value) override;
+  void SetControlsLocked(bool Value) override;
+  bool CanModify();
+  bool IsSourceReadOnly() override;
+  /// Raises `EComponentDesignerException` "Source is read-only", or what the host raises.
+  void ValidateModification();
+  void Edit(TComponent* Component) override;
+
+  // Selection and instances ---------------------------------------------------------------
+  void GetSelections(const IPtr<IDesignerSelections>& List) override;
+  IPtr<IDesignerSelections> GetSelection();
+  TPersistent* SelectedPersistent();
+  TComponent* SelectedComponent();
+  bool IsRootSelected();
+  IPtr<IItem> FindSelection(TPersistent* Persistent);
+  bool IsAnchorSelection(TPersistent* Persistent);
+  void SetSelections(const IPtr<IDesignerSelections>& List) override;
+  void SetSelection(const String& Name);
+  void SelectComponent(TPersistent* Instance) override;
+  void SelectComponent(const IPtr<IDesignObject>& Instance) override;
+  /// Virtual: forwards to `Select`.
+  virtual void SelectComponent(TPersistent* Instance, bool Add);
+  void Select(TPersistent* Instance, bool Add);
+  void ClearSelection() override;
+  void NoSelection() override;
+  IPtr<IComponentEditor> GetComponentEditor();
+  void CanInsertComponent(TComponent* Component);
+  void InstanceInserted(TPersistent* Instance);
+  void InstanceRemoved(TPersistent* Instance);
+  void EditComponent(TComponent* Component);
+  int GetCompCount();
+  TComponent* CompIndexToComponent(int Index);
+  String GetCompName(int Index);
+  String GetCompType(int Index);
+  String FindCompClass(const String& Name);
+  void Notification(TPersistent* AnObject, TOperation Operation) override;
+
+  // Creation ------------------------------------------------------------------------------
+  TComponent* DoCreateComponent(const IPtr<IInternalPaletteItem>& PaletteItem, IPtr<IItem> Parent, TRect Rect,
+                                bool SetBounds, bool Scaled);
+  void CreateComponent(const IPtr<IInternalPaletteItem>& PaletteItem);
+  TComponent* CreateComponent(TClass ComponentClass, TComponent* Parent, int Left, int Top, int Width,
+                              int Height) override;
+  void CreateComponentPos(const IPtr<IInternalPaletteItem>& PaletteItem, int X, int Y);
+  TComponent* CreateCurrentComponent(TComponent* Parent, const TRect& Rect) override;
+  TComponent* CreateCurrentComponentScaled(TComponent* Parent, const TRect& Rect, bool Scaled);
+  TComponent* CreateChild(TClass ComponentClass, TComponent* Parent) override;
+  IPtr<IItem> FindCurrentParentItem();
+  TComponent* FindCurrentParent();
+  TComponent* GetCurrentParent() override { return FindCurrentParent(); }
+  IPtr<IItem> FindItemParent(const IPtr<IItem>& Item);
+  void ForceCommonParent();
+  void ValidateComponent(TComponent* Component);
+
+  // Names ---------------------------------------------------------------------------------
+  String UniqueName(const String& BaseName) override;
+  void ValidateRename(TComponent* Component, const String& CurName, const String& NewName) override;
+  bool RenameComponent(const String& CurName, const String& NewName);
+
+  // IFile, IRoot, IInternalRoot: plain reads and forwards ---------------------------------
+  bool CheckFileDate() override { return true; }
+  bool FormFileOpen() override { return static_cast<bool>(FRoot); }
+  String GetFileName() override { return FFileName; }
+  int GetModifyTime() override { return FModifyTime; }
+  int GetTimeAtLoad() override { return FDiskAge; }
+  void Rename(const String& NewFileName) override;
+  void Save() override;
+  IPtr<IDesignerModule> GetModule() override { return FModule; }
+  TComponent* GetRoot() override { return FRoot; }
+  void GoDormant() override;
+  void ShowHelp() override;
+  IPtr<IDesigner> GetDesigner() override { return AsDesigner(); }
+  IPtr<IRoot> GetActiveView() override { return AsRoot(); }
+  int GetViewCount() override { return 0; }
+  IPtr<IRoot> GetView(int Index) override;
+  String GetViewName(int Index) override;
+  int GetViewIndex(const String&) override { return -1; }
+  IPtr<IRoot> GetMasterView() override { return nullptr; }
+  int AddView(const String& Name) override;
+  void GetViewPreview(TPersistent* Bitmap) override;
+  void GetViewPreview(const String& ViewName, TPersistent* Bitmap) override;
+  void RemoveView(const String& Name) override;
+  void RemoveView(int Index) override;
+  void HideForModule() override { Hide(); }
+  void ShowForModule() override { Show(); }
+  TClass GetCustomModuleClass() override { return FCustomModuleClass; }
+  TClass GetRootBaseClass() override { return GetRootClass(); }
+  IPtr<ICustomModule> GetCustomModule() override { return FCustomModule; }
+  IPtr<IUpdateManager> GetUpdateManager() override { return FRootUpdateManager; }
+  TObject* Implementor() override { return this; }
+  bool IsDormant() override { return false; }
+  void PasteSelectionFromStream(TStream* Stream, TComponent* Parent, const TRect& Rect) override;
+  void RemoveDependenciesOn(TComponent* Component) override;
+  void Resurrect() override {}
+  void UpdateDependencies() override {}
+  void SetActiveView(const IPtr<IRoot>&) override {}
+  IPtr<IRoot> GetAncestorRoot() override { return IPtr<IRoot>(FAncestorRoot); }
+  void CancelModes() override;
+  void CopySelectionToStream(TStream* Stream) override;
+  bool IsView() override { return false; }
+  bool SpecialPropertyHelp(const String& Member, String& HelpKeyword, String& HelpFile, int& HelpType) override;
+
+  // IDesigner: what the designer interface adds ----------------------------------------
+  void Activate() override;
+  TMethod CreateMethod(const String& Name, const TTypeData* TypeData) override;
+  TMethod CreateMethod(const String& Name, const IPtr<IEventInfo>& EventInfo) override;
+  String GetMethodName(const TMethod& Method) override;
+  void GetMethods(const TTypeData* TypeData, const TGetStrProc& Proc) override;
+  bool MethodExists(const String& Name) override;
+  void RenameMethod(const String& CurName, const String& NewName) override;
+  void ShowMethod(const String& Name) override;
+  void ChainCall(const String& MethodName, const String& InstanceName, const String& InstanceMethod,
+                 const TTypeData* TypeData) override;
+  void DeleteSelection(bool ADoAll) override;
+  TComponent* GetComponent(const String& Name) override;
+  String GetComponentName(TComponent* Component) override;
+  void GetComponentNames(const TTypeData* TypeData, const TGetStrProc& Proc) override;
+  TPersistent* GetObject(const String& Name) override;
+  String GetObjectName(TPersistent* Instance) override;
+  void GetObjectNames(const TTypeData* TypeData, const TGetStrProc& Proc) override;
+  bool IsComponentLinkable(TComponent* Component) override;
+  void MakeComponentLinkable(TComponent* Component) override;
+  bool IsComponentHidden(TComponent* Component) override;
+  void GetProjectModules(const TGetModuleProc& Proc) override;
+  IPtr<IDesigner> GetAncestorDesigner() override;
+  TComponent* FindRootAncestor(const String& Name) override;
+  void ModuleFileNames(String& ImplFileName, String& IntfFileName, String& FormFileName) override;
+  IPtr<IOTABasePaletteItem> GetPaletteItem(TClass ComponentClass) override;
+  void Revert(TPersistent* Instance, PPropInfo PropInfo) override;
+  String GetPathAndBaseExeName() override;
+  String GetPrivateDirectory() override;
+  String GetBaseRegKey() override;
+  bool GetIsDormant() override { return IsDormant(); }
+  void ModalEdit(char EditKey, const IPtr<IActivatable>& ReturnWindow) override;
+  void SelectItemName(const String& PropertyName) override;
+  String GetAppDataDirectory(bool Local) override;
+  String GetDesignerExtension() override;
+  IPtr<IInterface> GetIDEOptions() override;
+  TRect GetScrollRanges(const TPoint& ScrollPosition) override;
+  bool MethodFromAncestor(const TMethod& Method) override;
+
+  IPtr<IDesignEnvironment> GetEnvironment();
+
+protected:
+  // The framework's part --------------------------------------------------------------
+  /// Hide, show, show in a state: the design window.
+  virtual void HideRootWindow() = 0;
+  virtual void ShowRootWindow() = 0;
+  virtual void ShowRootWindowAs(TShowState State) = 0;
+  /// Before the root is destroyed.
+  virtual void TearDownRoot() = 0;
+  /// Frees the root component.
+  virtual void DestroyRootInstance(TComponent* Instance) = 0;
+  /// A new module without a stream was made; the last step.
+  virtual void NewRootCreated(TComponent* Instance, const String& ClassName) = 0;
+  /// Must create `FSurface` and `FSurfaceDesigner` and the window behind them.
+  virtual void InitializeSurface() = 0;
+  /// The instance has memory but no constructor has run: give it its designer link.
+  virtual void InitRootInstance(TComponent* Instance) = 0;
+  /// A new module without an ancestor: its first state.
+  virtual void InitNewRoot(TComponent* Instance, const String& ClassName) = 0;
+  /// The root's constructor and the custom module are done.
+  virtual void RootInstanceReady() = 0;
+  /// The topmost component that holds `Component`, or null.
+  virtual TComponent* RootOf(TComponent* Component) = 0;
+  /// Widget-tree questions.
+  virtual int GetControlCount(TComponent* Component) = 0;
+  virtual TComponent* GetControl(TComponent* Component, int Index) = 0;
+  virtual bool IsControl(TComponent* Component) = 0;
+  virtual TComponent* GetParent(TComponent* Component) = 0;
+
+  // State -------------------------------------------------------------------------------
+  IPtr<IInternalComponentDesigner> FDesigner;
+  IPtr<IDesignerModule> FModule;
+  IPtr<IComponentDesignSurface> FSurface;
+  IPtr<ISurfaceDesigner> FSurfaceDesigner;
+  IPtr<IUpdateManager> FRootUpdateManager;
+  IPtr<IInterfaceList> FUpdateManagers;
+  IPtr<IInternalRoot> FAncestorRoot;
+  IPtr<IComponentEditor> FRootEditor;
+  IPtr<ICustomModule> FCustomModule;
+  String FFileSystem;
+  String FFileName;
+  String FRootBaseClass;
+  String FRootName;
+  String FViewName;
+  TComponent* FRoot = nullptr;
+  TClass FRootClass = nullptr;
+  TClass FCustomModuleClass = nullptr;
+  IPtr<TSelections> FSelections;
+  IPtr<IInterfaceList> FMarkedItems;
+  TMemoryStream* FRootStream = nullptr;
+  std::vector<TComponent*> FModifiableFrames;
+  int FModifyTime = 0;
+  int FDiskAge = 0;
+  bool FCreateContainers = true;
+  bool FRevertingComponent = false;
+  bool FReadError = false;
+  bool FCreateFrameManagers = true;
+  bool FAllowNoSelection = false;
+  bool FIgnoreRename = false;
+  bool FClosing = false;
+  bool FGeneratePreview = true;
+  bool FInUndo = false;
+
+private:
+  void CreateNewModule(const TCreateArgs& Args);
+  TComponent* CreateRootAs(const String& ClassName, const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot);
+  void SetCreateInfo(const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot);
+  TComponent* CreateRootInstance(const String& ClassName);
+  void InternalInitializeDesigner(bool Resurrecting);
+  void InternalDeinitializeDesigner(bool GoingDormant);
+  void SelectionsChanged();
+  void FreeRootStream() noexcept;
+  bool IsModifiableFrame(TComponent* Component) const;
+};
+
+} // namespace formkit

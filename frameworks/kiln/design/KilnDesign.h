@@ -1,0 +1,324 @@
+//===- frameworks/kiln/design/KilnDesign.h - The Kiln designer package ---===//
+//
+// What puts Kiln forms, frames and data modules on a design surface: the
+// designer of the framework (`TKilnDesigner`, modules in ".kfm" files), its
+// module on design (`TKilnRoot`), the surface that shows a root's controls and
+// non-visual components (`TKilnSurface`), and the items of both.
+//
+// Example:
+//   StartDesignCore();
+//   RegisterKilnDesignPackage();              // while the package loads
+//   InitializeDesigners(Environment);         // the host, at start
+//   IPtr<IComponentDesigner> Kiln = Designers()->DesignerFromExtension(".kfm");
+//   IPtr<IRoot> Root = Kiln->CreateRoot(Module, "Unit1.kfm", false, "Form1", "", "", nullptr, "");
+//   auto* Surface = KilnSurfaceOf(Root);
+//   Surface->MouseDown(10, 10, {});            // gestures arrive as a window's input would
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include "core/ComponentDesigner.h"
+#include "core/root/ComponentRoot.h"
+#include "core/root/RootItems.h"
+#include "frameworks/kiln/KilnForms.h"
+#include "frameworks/kiln/KilnGraphics.h"
+#include "surface/DragBoxes.h"
+#include "surface/GestureEngine.h"
+
+namespace formkit {
+
+class TKilnSurface;
+
+/// The size of the icon of a non-visual component on a surface.
+inline constexpr int KilnIconSize = 28;
+/// The size of one grab handle.
+inline constexpr int KilnHandleSize = 5;
+
+//===----------------------------------------------------------------------===//
+// Designer
+//===----------------------------------------------------------------------===//
+
+/// The designer of the Kiln framework: serves roots that are controls or data modules,
+/// keeps its modules in files ending in ".kfm".
+class FK_API TKilnDesigner : public TComponentDesigner {
+  FK_CLASS(TKilnDesigner, TComponentDesigner)
+  explicit TKilnDesigner(const IPtr<IDesignEnvironment>& Environment = nullptr) : TComponentDesigner(Environment) {}
+
+  IPtr<IRoot> CreateRoot(const IPtr<IDesignerModule>& Module, const String& FileName, bool AExisting,
+                         const String& AFormName, const String& AAncestorName, const String& AFileSystem,
+                         const IPtr<IRoot>& AAncestorRoot, const String& AViewName) override;
+  IPtr<IRoot> CreateRootFromStream(const IPtr<IDesignerModule>& Module, const String& FileName,
+                                   const String& AFileSystem, const IPtr<IDatedStream>& AStream,
+                                   const IPtr<IRoot>& AAncestorRoot, const String& AViewName) override;
+  String GetDesignerName() override { return "Kiln"; }
+  String GetDesignerExtension() override { return ".kfm"; }
+  TClass GetDataModuleClass() override;
+  bool SupportsRootClass(TClass RootClass) override;
+
+  // Files: plain files of the machine; the file system name is not used.
+  TStream* OpenFile(const String& FileSystem, const String& Name, int Mode) override;
+  int GetFileAge(const String& FileSystem, const String& Name) override;
+  bool FileExists(const String& FileSystem, const String& Name) override;
+  bool RenameFile(const String& FileSystem, const String& OldName, const String& NewName) override;
+  void GetTempFileName(const String& FileSystem, const String& Name, String& TempName) override;
+  void GetBackupFileName(const String& FileSystem, const String& Name, String& BackupName) override;
+  bool IsFileReadOnly(const String& FileSystem, const String& Name) override;
+  bool DeleteFile(const String& FileSystem, const String& Name) override;
+  void FileWritten(const String& FileSystem, TStream* Stream) override;
+};
+
+FK_RESOURCESTRING(sKilnControlOnDataModule, "Controls cannot be added to a data module (%s)");
+FK_RESOURCESTRING(sKilnNotAKilnClass, "Class %s does not belong to the Kiln framework");
+
+/// What the framework adds to a module of forms: which classes may stand in it and
+/// whether its roots nest in other modules.
+class FK_API TKilnCustomModule : public TBaseCustomModule, public ICustomModule {
+  FK_CLASS(TKilnCustomModule, TBaseCustomModule)
+  FK_INTERFACES(ICustomModule)
+  void Create(TComponent* ARoot, const IPtr<IDesigner>& ADesigner) override;
+  TCustomModuleAttributes GetAttributes() override { return {}; }
+  void ExecuteVerb(int) override {}
+  String GetVerb(int) override { return ""; }
+  int GetVerbCount() override { return 0; }
+  void PrepareItem(int, const IPtr<IMenuItem>&) override {}
+  void Saving() override {}
+  /// Raises `EComponentDesignerException` for a class that is not the framework's.
+  void ValidateComponent(TComponent* Component) override;
+  /// Kiln controls and non-visual components.
+  bool ValidateComponentClass(TClass ComponentClass) override;
+  /// Forms do not nest in other modules.
+  bool Nestable() override { return false; }
+
+protected:
+  TComponent* FRoot = nullptr; // the module's root; the root holds this module
+};
+
+/// Frames nest in other modules.
+class FK_API TKilnFrameModule : public TKilnCustomModule {
+  FK_CLASS(TKilnFrameModule, TKilnCustomModule)
+  bool Nestable() override { return true; }
+};
+
+/// A data module holds non-visual components only.
+class FK_API TKilnDataModuleModule : public TKilnCustomModule {
+  FK_CLASS(TKilnDataModuleModule, TKilnCustomModule)
+  void ValidateComponent(TComponent* Component) override;
+  bool ValidateComponentClass(TClass ComponentClass) override;
+};
+
+/// Creates the Kiln designer and registers it with `Designers`.
+FK_API void InitializeKilnDesigner(const IPtr<IDesignEnvironment>& Environment);
+/// What the package does when it loads: the framework's classes, its custom modules
+/// (the core must run), the pixels-per-inch hook, and its designer's initializer.
+FK_API void RegisterKilnDesignPackage();
+
+//===----------------------------------------------------------------------===//
+// Module on design
+//===----------------------------------------------------------------------===//
+
+/// A Kiln module on design. A form is its own design window; a frame or a data module
+/// is shown in a window the root makes for it.
+class FK_API TKilnRoot : public TComponentRoot {
+  FK_CLASS(TKilnRoot, TComponentRoot)
+
+  /// The surface, or null while none is open.
+  TKilnSurface* KilnSurface() const noexcept { return FKilnSurface; }
+  /// The window that shows the module.
+  TCustomForm* DesignWindow() const noexcept { return FWindow; }
+
+protected:
+  void HideRootWindow() override;
+  void ShowRootWindow() override;
+  void ShowRootWindowAs(TShowState State) override;
+  void TearDownRoot() override;
+  void DestroyRootInstance(TComponent* Instance) override;
+  void NewRootCreated(TComponent* Instance, const String& ClassName) override;
+  void InitializeSurface() override;
+  void InitRootInstance(TComponent* Instance) override;
+  void InitNewRoot(TComponent* Instance, const String& ClassName) override;
+  void RootInstanceReady() override;
+  TComponent* RootOf(TComponent* Component) override;
+  int GetControlCount(TComponent* Component) override;
+  TComponent* GetControl(TComponent* Component, int Index) override;
+  bool IsControl(TComponent* Component) override;
+  TComponent* GetParent(TComponent* Component) override;
+
+private:
+  void LinkDesigner(TComponent* Instance, bool Link);
+  TKilnSurface* FKilnSurface = nullptr; // owned through FSurface
+  TCustomForm* FWindow = nullptr;       // the form itself, or one the root made
+  bool FOwnWindow = false;
+};
+
+/// The Kiln surface of a root given as `IRoot`; null for another framework's root.
+FK_API TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root);
+
+//===----------------------------------------------------------------------===//
+// Items
+//===----------------------------------------------------------------------===//
+
+/// The item of a control: its bounds in the parent's client area, the parent's item
+/// above it, its own client area for children, and guides at its four edges.
+class FK_API TKilnControlItem : public TComponentItem {
+  FK_CLASS(TKilnControlItem, TComponentItem)
+  FK_INTERFACES(IItemEx, IComponentItem)
+  TKilnControlItem() = default;
+  TKilnControlItem(TControl* Control, TKilnSurface* Surface, const IPtr<IDesigner>& Designer);
+
+  TControl* Control() const { return static_cast<TControl*>(FInstance); }
+  bool Contains(const IPtr<IItem>& Item) override;
+  TPoint GlobalToLocal(const TPoint& Point) override;
+  TPoint LocalToGlobal(const TPoint& Point) override;
+  /// The root's item is its client area at (0, 0); any other, its bounds in its parent.
+  TRect GetBoundsRect() override;
+  TRect GetClientRect() override;
+  IPtr<IItem> GetParent() override;
+  /// A control that accepts children.
+  bool IsContainer() override;
+  bool HasSelectableChildren() override { return IsContainer(); }
+  void SetBoundsRect(const TRect& Rect) override;
+  IPtr<IItem> GetChildren(int Index) override;
+  int GetChildCount() override;
+  void SetParent(const IPtr<IItem>& Parent) override;
+  void Show() override;
+  void ZOrder(bool Front) override;
+  bool HasGuidelines() override { return GetParent() != nullptr; }
+  IPtr<IItemGuidelines> GetItemGuidelines() override;
+
+private:
+  TKilnSurface* FSurface = nullptr;
+};
+
+/// The item of a non-visual component: an icon at its design position.
+class FK_API TKilnIconItem : public TComponentItem {
+  FK_CLASS(TKilnIconItem, TComponentItem)
+  TKilnIconItem() = default;
+  TKilnIconItem(TComponent* Component, TKilnSurface* Surface, const IPtr<IDesigner>& Designer);
+
+  TRect GetBoundsRect() override;
+  IPtr<IItem> GetParent() override;
+  void SetBoundsRect(const TRect& Rect) override;
+  TPoint GlobalToLocal(const TPoint& Point) override { return Point; }
+  TPoint LocalToGlobal(const TPoint& Point) override { return Point; }
+
+private:
+  TKilnSurface* FSurface = nullptr;
+};
+
+//===----------------------------------------------------------------------===//
+// Surface
+//===----------------------------------------------------------------------===//
+
+/// The palette as the engine sees it: a tool is armed when the host says one was picked.
+class FK_API TKilnTools : public TInterfacedObject, public ITools {
+  FK_CLASS(TKilnTools, TInterfacedObject)
+  FK_INTERFACES(ITools)
+  explicit TKilnTools(TKilnRoot* Root = nullptr) : FRoot(Root) {}
+  bool ToolSelected() override;
+
+private:
+  TKilnRoot* FRoot; // the root holds the engine that holds this
+};
+
+/// Grab handles on a single selected item: eight squares around it.
+class FK_API TKilnGrabHandles : public TInterfacedObject, public IGrabHandles {
+  FK_CLASS(TKilnGrabHandles, TInterfacedObject)
+  FK_INTERFACES(IGrabHandles)
+  explicit TKilnGrabHandles(TKilnSurface* Surface = nullptr) : FSurface(Surface) {}
+  IPtr<IItem> GetAttachedItem() override { return FItem; }
+  void AttachHandles(const IPtr<IItem>& Item) override;
+  TMoveAffects HandleAtPoint(int X, int Y) override;
+  void RefreshHandles() override;
+
+private:
+  TKilnSurface* FSurface;
+  IPtr<IItem> FItem;
+};
+
+/// Drag boxes drawn on the surface's canvas.
+class FK_API TKilnDragBoxes : public TXorDragBoxes {
+  FK_CLASS(TKilnDragBoxes, TXorDragBoxes)
+  explicit TKilnDragBoxes(TCanvas* Canvas = nullptr) : FCanvas(Canvas) {}
+
+protected:
+  void DrawBox(const TRect& Rect, TDesignBoxStyle Style) override;
+
+private:
+  TCanvas* FCanvas;
+};
+
+/// The surface of one Kiln module. Its design coordinates are the client area of the
+/// root's window; global coordinates are the same. Input arrives through `MouseDown`,
+/// `MouseMove`, `MouseUp` and `KeyDown`, as the window would deliver it.
+class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSurface {
+  FK_CLASS(TKilnSurface, TInterfacedObject)
+  FK_INTERFACES(IComponentDesignSurface)
+  TKilnSurface() : FCanvas(new TCanvas) {}
+  TKilnSurface(TKilnRoot* Root, TWinControl* Container);
+  void BeforeDestruction() override;
+
+  // Input, as the design window delivers it --------------------------------------------
+  void MouseDown(int X, int Y, TShiftState Shift, bool DoubleClick = false);
+  void MouseMove(int X, int Y);
+  void MouseUp(int X, int Y);
+  void KeyDown(TDesignKeyCode Key, TShiftState Shift = {}, char Ch = 0);
+
+  /// Where feedback is drawn: drag boxes, handles, icons.
+  TCanvas* Canvas() noexcept { return FCanvas; }
+  TKilnRoot* Root() const noexcept { return FRoot; }
+  TWinControl* Container() const noexcept { return FContainer; }
+  /// The item of a component of the module.
+  IPtr<IItem> ItemOf(TComponent* Component);
+
+  // IDesignSurface ------------------------------------------------------------------------
+  void AddListener(const IPtr<IDesignSurfaceListener>& Listener) override { FListener = Listener; }
+  IPtr<IDragBoxes> BeginDrag(const IPtr<IItem>& Parent, const TPoint& Point) override;
+  void Close() override;
+  IPtr<IItem> CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) override;
+  TPoint GetCursorPoint() override { return FCursor; }
+  void DeleteSelection() override;
+  TPoint DesignToGlobal(const TPoint& Point) override { return Point; }
+  void DestroyItem(const IPtr<IItem>& Item) override;
+  IPtr<IItem> FindNextItem(const IPtr<IItem>& Item, bool Forward) override;
+  void FocusSurface() override { FFocused = true; }
+  IPtr<IGrabHandles> GetGrabHandles() override { return FHandles; }
+  IPtr<IGuidelinePainter> GetGuidelinePainter() override { return nullptr; }
+  IPtr<IItem> GetItems(int Index) override;
+  int GetItemsCount() override;
+  TPoint GetOrigin() override { return {0, 0}; }
+  IPtr<IItem> GetRoot() override;
+  IPtr<IItem> GetContainerItem() override { return GetRoot(); }
+  TPoint GlobalToDesign(const TPoint& Point) override { return Point; }
+  bool GridSnapDisabled() override { return false; }
+  IPtr<IItem> ItemAtPoint(int X, int Y) override;
+  void RemoveListener(const IPtr<IDesignSurfaceListener>& Listener) override;
+  void ShowContextMenu() override {}
+  void ValidateModification() override;
+  void Modified() override;
+  bool ItemInSelections(const IPtr<ISelections>& Selections, const IPtr<IItem>& Item) override;
+  IPtr<IItem> ItemFromComponent(TComponent* Component) override { return ItemOf(Component); }
+
+  // IComponentDesignSurface --------------------------------------------------------------
+  void UpdateSurface() override;
+  void RefreshItems() override {}
+  void BeforeRootModified() override {}
+  void ItemRemoved(TComponent* Component) override;
+  void SetOptions(const TDesignSurfaceOptions& Options) override { FOptions = Options; }
+  void SetInitializing(bool Value) override { FInitializing = Value; }
+
+  const TDesignSurfaceOptions& Options() const noexcept { return FOptions; }
+  bool Focused() const noexcept { return FFocused; }
+
+private:
+  TKilnRoot* FRoot = nullptr;       // the root holds this surface
+  TWinControl* FContainer = nullptr; // the root's window (a form, or the window of a frame)
+  IPtr<IDesignSurfaceListener> FListener;
+  IPtr<TKilnGrabHandles> FHandles;
+  TCanvas* FCanvas; // owned
+  TDesignSurfaceOptions FOptions;
+  TPoint FCursor;
+  bool FFocused = false;
+  bool FInitializing = false;
+};
+
+} // namespace formkit

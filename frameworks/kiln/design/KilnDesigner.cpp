@@ -1,0 +1,120 @@
+//===- frameworks/kiln/design/KilnDesigner.cpp - The Kiln designer -------===//
+#include "frameworks/kiln/design/KilnDesign.h"
+
+#include "core/Designers.h"
+#include "frameworks/kiln/Kiln.h"
+
+#include <sys/stat.h>
+#include <cstdio>
+#include <unistd.h>
+
+namespace formkit {
+
+FK_IMPLEMENT(TKilnDesigner, "KilnDesign") {}
+FK_IMPLEMENT(TKilnCustomModule, "KilnDesign") {}
+FK_IMPLEMENT(TKilnFrameModule, "KilnDesign") {}
+FK_IMPLEMENT(TKilnDataModuleModule, "KilnDesign") {}
+
+void TKilnCustomModule::Create(TComponent* ARoot, const IPtr<IDesigner>& ADesigner) {
+  inherited::Create(ARoot, ADesigner);
+  FRoot = ARoot;
+}
+
+void TKilnCustomModule::ValidateComponent(TComponent* Component) {
+  if (!ValidateComponentClass(Component->ClassType()))
+    throw EComponentDesignerException(sKilnNotAKilnClass, Component->ClassName());
+}
+
+bool TKilnCustomModule::ValidateComponentClass(TClass ComponentClass) {
+  return ComponentClass->InheritsFrom(TComponent::StaticClass()) &&
+         !ComponentClass->InheritsFrom(TCustomForm::StaticClass());
+}
+
+void TKilnDataModuleModule::ValidateComponent(TComponent* Component) {
+  if (dynamic_cast<TControl*>(Component)) throw EComponentDesignerException(sKilnControlOnDataModule, Component->ClassName());
+  inherited::ValidateComponent(Component);
+}
+
+bool TKilnDataModuleModule::ValidateComponentClass(TClass ComponentClass) {
+  return inherited::ValidateComponentClass(ComponentClass) && !ComponentClass->InheritsFrom(TControl::StaticClass());
+}
+
+IPtr<IRoot> TKilnDesigner::CreateRoot(const IPtr<IDesignerModule>& Module, const String& FileName, bool AExisting,
+                                      const String& AFormName, const String& AAncestorName,
+                                      const String& AFileSystem, const IPtr<IRoot>& AAncestorRoot,
+                                      const String& AViewName) {
+  IPtr<TKilnRoot> Root = New<TKilnRoot>();
+  Root->Create({IPtr<IComponentDesigner>(this), Module, FileName, AExisting, nullptr, AFormName, AAncestorName,
+                AFileSystem, AAncestorRoot, AViewName});
+  return Root->AsRoot();
+}
+
+IPtr<IRoot> TKilnDesigner::CreateRootFromStream(const IPtr<IDesignerModule>& Module, const String& FileName,
+                                                const String& AFileSystem, const IPtr<IDatedStream>& AStream,
+                                                const IPtr<IRoot>& AAncestorRoot, const String& AViewName) {
+  IPtr<TKilnRoot> Root = New<TKilnRoot>();
+  Root->Create({IPtr<IComponentDesigner>(this), Module, FileName, true, AStream, "", "", AFileSystem, AAncestorRoot,
+                AViewName});
+  return Root->AsRoot();
+}
+
+TClass TKilnDesigner::GetDataModuleClass() { return TDataModule::StaticClass(); }
+
+bool TKilnDesigner::SupportsRootClass(TClass RootClass) {
+  return RootClass->InheritsFrom(TControl::StaticClass()) || RootClass->InheritsFrom(TDataModule::StaticClass());
+}
+
+TStream* TKilnDesigner::OpenFile(const String&, const String& Name, int Mode) {
+  return new TFileStream(Name, static_cast<std::uint16_t>(Mode));
+}
+
+int TKilnDesigner::GetFileAge(const String&, const String& Name) {
+  struct stat Info {};
+  if (::stat(Name.c_str(), &Info) != 0) return -1;
+  return static_cast<int>(Info.st_mtime);
+}
+
+bool TKilnDesigner::FileExists(const String&, const String& Name) {
+  struct stat Info {};
+  return ::stat(Name.c_str(), &Info) == 0 && S_ISREG(Info.st_mode);
+}
+
+bool TKilnDesigner::RenameFile(const String&, const String& OldName, const String& NewName) {
+  return std::rename(OldName.c_str(), NewName.c_str()) == 0;
+}
+
+void TKilnDesigner::GetTempFileName(const String&, const String& Name, String& TempName) {
+  TempName = ChangeFileExt(Name, ".$$$");
+}
+
+void TKilnDesigner::GetBackupFileName(const String&, const String& Name, String& BackupName) {
+  String Ext = ExtractFileExt(Name);
+  BackupName = ChangeFileExt(Name, Ext.size() > 1 ? ".~" + Ext.substr(1) : String(".~"));
+}
+
+bool TKilnDesigner::IsFileReadOnly(const String&, const String& Name) {
+  return FileExists("", Name) && ::access(Name.c_str(), W_OK) != 0;
+}
+
+bool TKilnDesigner::DeleteFile(const String&, const String& Name) { return std::remove(Name.c_str()) == 0; }
+
+void TKilnDesigner::FileWritten(const String&, TStream*) {}
+
+void InitializeKilnDesigner(const IPtr<IDesignEnvironment>& Environment) {
+  if (auto All = Designers()) All->RegisterDesigner(NewAs<IComponentDesigner, TKilnDesigner>(Environment));
+}
+
+void RegisterKilnDesignPackage() {
+  InitializeKiln();
+  RegisterCustomModule(TForm::StaticClass(), TKilnCustomModule::StaticClass());
+  RegisterCustomModule(TFrame::StaticClass(), TKilnFrameModule::StaticClass());
+  RegisterCustomModule(TDataModule::StaticClass(), TKilnDataModuleModule::StaticClass());
+  // Creation on a surface scales by the pixels per inch of the parent control.
+  GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {
+    auto* Control = dynamic_cast<TControl*>(ExtractComponent(Item));
+    return Control ? Control->CurrentPPI() : 96;
+  };
+  RegisterInitializeDesigner(&InitializeKilnDesigner);
+}
+
+} // namespace formkit

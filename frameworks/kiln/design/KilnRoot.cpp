@@ -1,0 +1,123 @@
+//===- frameworks/kiln/design/KilnRoot.cpp - A Kiln module on design -----===//
+#include "frameworks/kiln/design/KilnDesign.h"
+
+namespace formkit {
+
+FK_IMPLEMENT(TKilnRoot, "KilnDesign") {}
+FK_IMPLEMENT(TKilnTools, "KilnDesign") {}
+
+bool TKilnTools::ToolSelected() {
+  IPtr<IDesignEnvironment> Env = FRoot ? FRoot->GetEnvironment() : nullptr;
+  IPtr<IOTABasePaletteItem> Tool;
+  if (Env) Env->GetToolSelected(Tool);
+  return static_cast<bool>(Tool);
+}
+
+namespace {
+/// Default client size of a new form's design window.
+constexpr int NewFormWidth = 640;
+constexpr int NewFormHeight = 480;
+} // namespace
+
+void TKilnRoot::LinkDesigner(TComponent* Instance, bool Link) {
+  IDesignerNotify* Designer = Link ? static_cast<IDesigner*>(this) : nullptr;
+  if (auto* Form = dynamic_cast<TCustomForm*>(Instance)) Form->SetDesigner(Designer);
+  else if (auto* Frame = dynamic_cast<TCustomFrame*>(Instance)) Frame->SetDesigner(Designer);
+  else if (auto* Module = dynamic_cast<TDataModule*>(Instance)) Module->SetDesigner(Designer);
+}
+
+void TKilnRoot::InitRootInstance(TComponent* Instance) { LinkDesigner(Instance, true); }
+
+void TKilnRoot::InitNewRoot(TComponent* Instance, const String&) {
+  if (auto* Form = dynamic_cast<TCustomForm*>(Instance)) {
+    Form->SetClientWidth(NewFormWidth);
+    Form->SetClientHeight(NewFormHeight);
+  }
+}
+
+void TKilnRoot::NewRootCreated(TComponent* Instance, const String&) {
+  // A new form's caption is its name.
+  if (auto* Control = dynamic_cast<TControl*>(Instance)) Control->SetCaption(Instance->Name());
+}
+
+void TKilnRoot::RootInstanceReady() {
+  // The window that shows the module: a form shows itself; a frame or a data module is
+  // shown in a window of its own.
+  if (auto* Form = dynamic_cast<TCustomForm*>(FRoot)) {
+    FWindow = Form;
+    FOwnWindow = false;
+    return;
+  }
+  FWindow = CreateComponentOf<TForm>(nullptr);
+  FOwnWindow = true;
+  if (auto* Frame = dynamic_cast<TCustomFrame*>(FRoot)) Frame->SetParent(FWindow);
+}
+
+void TKilnRoot::InitializeSurface() {
+  auto* Container = dynamic_cast<TWinControl*>(FRoot);
+  IPtr<TKilnSurface> Surface = New<TKilnSurface>(this, Container ? Container : FWindow);
+  FKilnSurface = Surface.Get();
+  FSurface = InterfaceOf<IComponentDesignSurface>(Surface.Get());
+  IPtr<TDesigner> Engine =
+      New<TDesigner>(IPtr<IDesignSurface>(FSurface), SelectionItems(), NewAs<ITools, TKilnTools>(this));
+  FSurfaceDesigner = InterfaceOf<ISurfaceDesigner>(Engine.Get());
+}
+
+void TKilnRoot::TearDownRoot() {
+  FKilnSurface = nullptr;
+  if (FRoot) LinkDesigner(FRoot, false);
+  if (FOwnWindow && FWindow) {
+    // The module's frame is not the window's to free.
+    if (auto* Frame = dynamic_cast<TCustomFrame*>(FRoot)) Frame->SetParent(nullptr);
+    FreeAndNil(FWindow);
+  }
+  FWindow = nullptr;
+  FOwnWindow = false;
+}
+
+void TKilnRoot::DestroyRootInstance(TComponent* Instance) { Instance->Destroy(); }
+
+void TKilnRoot::HideRootWindow() {
+  if (FWindow) FWindow->Hide();
+}
+
+void TKilnRoot::ShowRootWindow() {
+  if (FWindow) FWindow->Show();
+}
+
+void TKilnRoot::ShowRootWindowAs(TShowState State) {
+  if (!FWindow) return;
+  if (State == ssMinimized) FWindow->Hide();
+  else FWindow->Show();
+}
+
+TComponent* TKilnRoot::RootOf(TComponent* Component) {
+  TComponent* Top = Component;
+  while (Top && Top->Owner()) Top = Top->Owner();
+  return Top;
+}
+
+int TKilnRoot::GetControlCount(TComponent* Component) {
+  auto* Win = dynamic_cast<TWinControl*>(Component);
+  return Win ? Win->ControlCount() : 0;
+}
+
+TComponent* TKilnRoot::GetControl(TComponent* Component, int Index) {
+  auto* Win = dynamic_cast<TWinControl*>(Component);
+  return Win ? Win->Controls(Index) : nullptr;
+}
+
+bool TKilnRoot::IsControl(TComponent* Component) { return dynamic_cast<TControl*>(Component) != nullptr; }
+
+TComponent* TKilnRoot::GetParent(TComponent* Component) {
+  auto* Control = dynamic_cast<TControl*>(Component);
+  return Control ? Control->Parent() : nullptr;
+}
+
+TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root) {
+  auto Internal = QueryAs<IInternalRoot>(Root);
+  auto* Kiln = Internal ? dynamic_cast<TKilnRoot*>(Internal->Implementor()) : nullptr;
+  return Kiln ? Kiln->KilnSurface() : nullptr;
+}
+
+} // namespace formkit

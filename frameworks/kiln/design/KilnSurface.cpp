@@ -1,0 +1,213 @@
+//===- frameworks/kiln/design/KilnSurface.cpp - The surface of a Kiln module ===//
+#include "frameworks/kiln/design/KilnDesign.h"
+
+namespace formkit {
+
+FK_IMPLEMENT(TKilnSurface, "KilnDesign") {}
+FK_IMPLEMENT(TKilnGrabHandles, "KilnDesign") {}
+FK_IMPLEMENT(TKilnDragBoxes, "KilnDesign") {}
+
+namespace {
+
+/// An item's bounds in the surface's coordinates.
+TRect SurfaceBounds(const IPtr<IItem>& Item) {
+  TRect B = Item->GetBoundsRect();
+  if (IPtr<IItem> Parent = Item->GetParent()) {
+    TPoint O = Parent->LocalToGlobal({0, 0});
+    B.Offset(O.X, O.Y);
+  }
+  return B;
+}
+} // namespace
+
+//===----------------------------------------------------------------------===//
+// Drag boxes and grab handles
+//===----------------------------------------------------------------------===//
+
+void TKilnDragBoxes::DrawBox(const TRect& Rect, TDesignBoxStyle) {
+  if (FCanvas) FCanvas->FrameRect(Rect);
+}
+
+void TKilnGrabHandles::AttachHandles(const IPtr<IItem>& Item) {
+  FItem = Item;
+  RefreshHandles();
+}
+
+namespace {
+struct THandle {
+  TPoint Center;
+  TMoveAffects Affects;
+};
+std::vector<THandle> HandlesAround(const TRect& B) {
+  int MX = B.Left + B.Width() / 2, MY = B.Top + B.Height() / 2;
+  return {{{B.Left, B.Top}, {gaLeft, gaTop}},     {{MX, B.Top}, {gaTop}},
+          {{B.Right, B.Top}, {gaRight, gaTop}},   {{B.Right, MY}, {gaRight}},
+          {{B.Right, B.Bottom}, {gaRight, gaBottom}}, {{MX, B.Bottom}, {gaBottom}},
+          {{B.Left, B.Bottom}, {gaLeft, gaBottom}}, {{B.Left, MY}, {gaLeft}}};
+}
+TRect HandleRect(TPoint C) {
+  return Bounds(C.X - KilnHandleSize / 2, C.Y - KilnHandleSize / 2, KilnHandleSize, KilnHandleSize);
+}
+} // namespace
+
+TMoveAffects TKilnGrabHandles::HandleAtPoint(int X, int Y) {
+  if (!FItem) return {};
+  for (const THandle& H : HandlesAround(SurfaceBounds(FItem)))
+    if (HandleRect(H.Center).Contains({X, Y})) return H.Affects;
+  return {};
+}
+
+void TKilnGrabHandles::RefreshHandles() {
+  if (!FItem || !FSurface) return;
+  for (const THandle& H : HandlesAround(SurfaceBounds(FItem))) FSurface->Canvas()->FillRect(HandleRect(H.Center));
+}
+
+//===----------------------------------------------------------------------===//
+// The surface
+//===----------------------------------------------------------------------===//
+
+TKilnSurface::TKilnSurface(TKilnRoot* Root, TWinControl* Container)
+    : FRoot(Root), FContainer(Container), FHandles(New<TKilnGrabHandles>(this)), FCanvas(new TCanvas) {}
+
+void TKilnSurface::BeforeDestruction() {
+  FHandles = nullptr;
+  FreeAndNil(FCanvas);
+  inherited::BeforeDestruction();
+}
+
+IPtr<IItem> TKilnSurface::ItemOf(TComponent* Component) {
+  if (!Component || !FRoot) return nullptr;
+  IPtr<IDesigner> Designer = FRoot->AsDesigner();
+  if (auto* Control = dynamic_cast<TControl*>(Component))
+    return NewAs<IItem, TKilnControlItem>(Control, this, Designer);
+  if (Component->Owner() == FRoot->Root()) return NewAs<IItem, TKilnIconItem>(Component, this, Designer);
+  return NewAs<IItem, TNonControlItem>(Component, Designer);
+}
+
+IPtr<IItem> TKilnSurface::GetRoot() { return ItemOf(FContainer); }
+
+IPtr<IItem> TKilnSurface::GetItems(int Index) {
+  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  return Root ? ItemOf(Root->Components(Index)) : nullptr;
+}
+
+int TKilnSurface::GetItemsCount() {
+  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  return Root ? Root->ComponentCount() : 0;
+}
+
+IPtr<IItem> TKilnSurface::ItemAtPoint(int X, int Y) {
+  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  // Icons lie above the controls; the last one above the others.
+  if (Root)
+    for (int I = Root->ComponentCount() - 1; I >= 0; --I) {
+      TComponent* C = Root->Components(I);
+      if (dynamic_cast<TControl*>(C)) continue;
+      IPtr<IItem> Icon = ItemOf(C);
+      if (Icon->GetBoundsRect().Contains({X, Y})) return Icon;
+    }
+  // Then the deepest control of the module under the point.
+  TWinControl* Current = FContainer;
+  TPoint P{X, Y};
+  for (;;) {
+    TControl* Hit = Current->ControlAtPos(P, true, true, false);
+    if (!Hit || (Root && Hit->Owner() != Root && Hit != Root)) break;
+    TPoint O = Hit->ClientToParent({0, 0}, Current);
+    P = {P.X - O.X, P.Y - O.Y};
+    auto* Win = dynamic_cast<TWinControl*>(Hit);
+    if (!Win) return ItemOf(Hit);
+    Current = Win;
+  }
+  return ItemOf(Current);
+}
+
+IPtr<IDragBoxes> TKilnSurface::BeginDrag(const IPtr<IItem>&, const TPoint&) {
+  return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas);
+}
+
+IPtr<IItem> TKilnSurface::CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) {
+  TComponent* Component = FRoot->CreateCurrentComponentScaled(ExtractComponent(Parent), Rect, Scaled);
+  return ItemOf(Component);
+}
+
+void TKilnSurface::DeleteSelection() { FRoot->DeleteSelection(false); }
+
+void TKilnSurface::DestroyItem(const IPtr<IItem>& Item) {
+  if (TComponent* C = ExtractComponent(Item)) C->Destroy();
+}
+
+IPtr<IItem> TKilnSurface::FindNextItem(const IPtr<IItem>& Item, bool Forward) {
+  int Count = GetItemsCount();
+  if (Count == 0) return nullptr;
+  int At = -1;
+  for (int I = 0; I < Count && At < 0; ++I)
+    if (SameItem(GetItems(I), Item)) At = I;
+  int Next = At < 0 ? (Forward ? 0 : Count - 1) : (At + (Forward ? 1 : Count - 1)) % Count;
+  return GetItems(Next);
+}
+
+void TKilnSurface::RemoveListener(const IPtr<IDesignSurfaceListener>& Listener) {
+  if (FListener == Listener) FListener = nullptr;
+}
+
+void TKilnSurface::Close() {
+  if (FHandles) FHandles->AttachHandles(nullptr);
+  FListener = nullptr;
+  FRoot = nullptr;
+}
+
+void TKilnSurface::ValidateModification() { FRoot->ValidateModification(); }
+
+void TKilnSurface::Modified() { FRoot->Modified(); }
+
+bool TKilnSurface::ItemInSelections(const IPtr<ISelections>& Selections, const IPtr<IItem>& Item) {
+  IPtr<IItem> Container = GetContainerItem();
+  for (IPtr<IItem> Current = Item; Current && !SameItem(Current, Container); Current = Current->GetParent())
+    if (Selections->Selected(Current)) return true;
+  return false;
+}
+
+void TKilnSurface::UpdateSurface() {
+  // Icons of the non-visual components, with their names.
+  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  if (!Root || !FOptions.ShowNonVisualComponents) return;
+  for (int I = 0; I < Root->ComponentCount(); ++I) {
+    TComponent* C = Root->Components(I);
+    if (dynamic_cast<TControl*>(C)) continue;
+    TRect B = ItemOf(C)->GetBoundsRect();
+    FCanvas->Rectangle(B);
+    if (FOptions.ShowComponentCaptions) FCanvas->TextOut(B.Left, B.Bottom, C->Name());
+  }
+}
+
+void TKilnSurface::ItemRemoved(TComponent* Component) {
+  if (FHandles && ExtractComponent(FHandles->GetAttachedItem()) == Component) FHandles->AttachHandles(nullptr);
+}
+
+//===----------------------------------------------------------------------===//
+// Input
+//===----------------------------------------------------------------------===//
+
+void TKilnSurface::MouseDown(int X, int Y, TShiftState Shift, bool DoubleClick) {
+  FCursor = {X, Y};
+  if (!FListener) return;
+  TMoveAffects Affects = FHandles->HandleAtPoint(X, Y);
+  IPtr<IItem> Item = Affects.Empty() ? ItemAtPoint(X, Y) : FHandles->GetAttachedItem();
+  FListener->MouseDown(Item, Shift, X, Y, DoubleClick, Affects, false);
+}
+
+void TKilnSurface::MouseMove(int X, int Y) {
+  FCursor = {X, Y};
+  if (FListener) FListener->MouseMove(X, Y);
+}
+
+void TKilnSurface::MouseUp(int X, int Y) {
+  FCursor = {X, Y};
+  if (FListener) FListener->MouseUp(X, Y);
+}
+
+void TKilnSurface::KeyDown(TDesignKeyCode Key, TShiftState Shift, char Ch) {
+  if (FListener) FListener->Key(Key, Shift, Ch, false);
+}
+
+} // namespace formkit

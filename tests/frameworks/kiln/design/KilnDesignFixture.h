@@ -1,0 +1,84 @@
+//===- tests/frameworks/kiln/design/KilnDesignFixture.h - A Kiln designer at work ===//
+//
+// Starts the design core with the Kiln designer package and a recording host,
+// and opens new form modules on it. A tool is armed as the host's palette does.
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include "core/DesignCore.h"
+#include "core/Designers.h"
+#include "frameworks/kiln/Kiln.h"
+#include "frameworks/kiln/KilnExtCtrls.h"
+#include "frameworks/kiln/KilnStdCtrls.h"
+#include "frameworks/kiln/design/KilnDesign.h"
+#include "tests/fakes/RecordingEnvironment.h"
+#include "tests/fakes/RecordingModule.h"
+
+#include <gtest/gtest.h>
+
+namespace formkit::fakes {
+
+/// A palette entry the host offers: it makes its class and says whether it is usable.
+class TToolItem : public TClassPaletteItem, public IOTABasePaletteItem {
+  FK_CLASS(TToolItem, TClassPaletteItem)
+  FK_INTERFACES(IOTABasePaletteItem)
+  explicit TToolItem(TClass Class = nullptr) : TClassPaletteItem(Class), FClass(Class) {}
+  String GetIDString() override { return FClass ? FClass->ClassName : ""; }
+  bool GetEnabled() override { return Enabled; }
+  bool Enabled = true;
+
+private:
+  TClass FClass;
+};
+
+struct KilnDesignFixture : ::testing::Test {
+  TCallLog Log;
+  IPtr<TRecordingEnvironment> Env;
+  IPtr<IComponentDesigner> Designer;
+  std::vector<IPtr<IRoot>> Open;
+
+  void SetUp() override {
+    StartDesignCore();
+    RegisterKilnDesignPackage();
+    Env = New<TRecordingEnvironment>(&Log);
+    InitializeDesigners(InterfaceOf<IDesignEnvironment>(Env.Get()));
+    Designer = Designers()->DesignerFromExtension(".kfm");
+    ASSERT_TRUE(Designer);
+  }
+  void TearDown() override {
+    for (auto& R : Open)
+      if (R->FormFileOpen()) R->Close();
+    Open.clear();
+    if (Designer) Designers()->UnregisterDesigner(Designer);
+    Designer = nullptr;
+    GetPPIForKilnDesignerForIItemFunc = nullptr;
+    StopDesignCore();
+    FinalizeKiln();
+  }
+
+  /// A new form module "Name" with a recording module record.
+  IPtr<IRoot> NewForm(const String& Name, IPtr<TRecordingModule>* ModuleOut = nullptr) {
+    IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
+    if (ModuleOut) *ModuleOut = Module;
+    IPtr<IRoot> Root =
+        Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name, "", "", nullptr, "");
+    Open.push_back(Root);
+    return Root;
+  }
+  static TKilnRoot* KilnRoot(const IPtr<IRoot>& Root) {
+    return dynamic_cast<TKilnRoot*>(QueryAs<IInternalRoot>(Root)->Implementor());
+  }
+  /// Arms the palette with a tool of `Class`; null disarms.
+  void Arm(TClass Class) {
+    Env->ToolSelected = Class ? InterfaceOf<IOTABasePaletteItem>(New<TToolItem>(Class).Get()) : nullptr;
+  }
+  /// A drag with the mouse from one point to another, in surface coordinates.
+  static void Drag(TKilnSurface* S, TPoint From, TPoint To, TShiftState Shift = {}) {
+    S->MouseDown(From.X, From.Y, Shift);
+    S->MouseMove(To.X, To.Y);
+    S->MouseUp(To.X, To.Y);
+  }
+};
+
+} // namespace formkit::fakes
