@@ -27,6 +27,10 @@ std::function<IPtr<IComponentEditor>(TComponent*, const IPtr<IDesigner>&)> TRoot
 std::function<void*(TComponentRoot&, const String&)> TRootHooks::CreateSubClassMethod;
 std::function<void(TComponentRoot&, bool)> TRootHooks::DeleteSelection;
 std::function<void(TComponentRoot&)> TRootHooks::SaveModule;
+std::function<bool(TClass)> TRootHooks::IsProxyClass;
+std::function<void(TComponent*, TClass)> TRootHooks::ChangeToProxyClass;
+std::function<void(TComponentRoot&, TComponent*)> TRootHooks::ValidateInheritence;
+std::function<void(TComponentRoot&, TComponent*, TStream*)> TRootHooks::ReadObjectFromStream;
 
 void RaiseServiceNotAvailable(const char* Service) { throw EComponentDesignerException(sServiceNotAvailable, Service); }
 

@@ -23,6 +23,8 @@
 #include "core/root/RootHooks.h"
 #include "platform/Streams.h"
 
+#include <unordered_map>
+
 namespace formkit {
 
 FK_EXCEPTION(ECannotDeleteNonComponentException, EComponentDesignerException);
@@ -37,6 +39,8 @@ FK_RESOURCESTRING(sComponentAlreadyExists, "A component named %s already exists 
 FK_RESOURCESTRING(sRootMustHaveName, "Root component must have a name");
 FK_RESOURCESTRING(sAncestorClassName, "Cannot rename a module to the same name as one of its ancestors (%s)");
 FK_RESOURCESTRING(sServiceNotAvailable, "%s is not available");
+FK_RESOURCESTRING(sCannotPasteForm, "Cannot paste a form or datamodule into another form or datamodule");
+FK_RESOURCESTRING(sNestedInsertedInSelf, "A nested component cannot be inserted into itself");
 
 /// A palette entry that can make its component.
 struct FK_API IInternalPaletteItem : IInterface {
@@ -178,6 +182,11 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   TComponent* CreateCurrentComponent(TComponent* Parent, const TRect& Rect) override;
   TComponent* CreateCurrentComponentScaled(TComponent* Parent, const TRect& Rect, bool Scaled);
   TComponent* CreateChild(TClass ComponentClass, TComponent* Parent) override;
+  /// Instantiates the module of a proxy class as a nested frame owned by `Owner`; null
+  /// when the class is no proxy class or no module has it.
+  TComponent* FrameCreateComponent(TClass ComponentClass, TComponent* Owner);
+  /// The root component of the module a nested frame instance copies, or null.
+  TComponent* GetInliningComponent(TComponent* Component) const;
   IPtr<IItem> FindCurrentParentItem();
   TComponent* FindCurrentParent();
   TComponent* GetCurrentParent() override { return FindCurrentParent(); }
@@ -301,6 +310,8 @@ protected:
   virtual TComponent* GetControl(TComponent* Component, int Index) = 0;
   virtual bool IsControl(TComponent* Component) = 0;
   virtual TComponent* GetParent(TComponent* Component) = 0;
+  /// A component joined the module by streaming a nested frame.
+  virtual void FrameComponentAdded(TComponent* Component) = 0;
 
   // State -------------------------------------------------------------------------------
   IPtr<IInternalComponentDesigner> FDesigner;
@@ -324,6 +335,8 @@ protected:
   IPtr<IInterfaceList> FMarkedItems;
   TMemoryStream* FRootStream = nullptr;
   std::vector<TComponent*> FModifiableFrames;
+  /// Nested frame instance to the root component of the module it copies.
+  std::unordered_map<TComponent*, TComponent*> FInliningComponents;
   int FModifyTime = 0;
   int FDiskAge = 0;
   bool FCreateContainers = true;

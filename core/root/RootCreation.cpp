@@ -6,7 +6,9 @@
 //
 //===----------------------------------------------------------------------===//
 #include "core/root/ComponentRoot.h"
+#include "platform/Filer.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace formkit {
@@ -243,6 +245,76 @@ void TComponentRoot::CreateComponentPos(const IPtr<IInternalPaletteItem>& Palett
     if (GY > 0) Y = (Y / GY) * GY;
   }
   DoCreateComponent(PaletteItem, Parent, Rect(X, Y, X + 1, Y + 1), true, true);
+}
+
+} // namespace formkit
+
+namespace formkit {
+
+namespace {
+/// Whether `Class` is the class of `C` or of anything it owns, at any depth.
+bool HoldsClass(TComponent* C, TClass Class) {
+  if (C->ClassType() == Class) return true;
+  for (int I = 0; I < C->ComponentCount(); ++I)
+    if (HoldsClass(C->Components(I), Class)) return true;
+  return false;
+}
+} // namespace
+
+TComponent* TComponentRoot::GetInliningComponent(TComponent* Component) const {
+  auto It = FInliningComponents.find(Component);
+  return It == FInliningComponents.end() ? nullptr : It->second;
+}
+
+TComponent* TComponentRoot::FrameCreateComponent(TClass ComponentClass, TComponent* Owner) {
+  if (!TRootHooks::IsProxyClass || !TRootHooks::IsProxyClass(ComponentClass)) return nullptr;
+  IPtr<IInternalRoot> Module = QueryAs<IInternalRoot>(FDesigner->OpenRootClass(ComponentClass->ClassName));
+  if (!Module) return nullptr;
+  if (IPtr<ICustomModule> Custom = Module->GetCustomModule(); !Custom || !Custom->Nestable())
+    throw EComponentDesignerException(sCannotPasteForm);
+  TComponent* Ancestor = Module->GetRoot();
+  if (Owner && HoldsClass(Ancestor, Owner->ClassType())) throw EComponentDesignerException(sNestedInsertedInSelf);
+  if (TRootHooks::ValidateInheritence) TRootHooks::ValidateInheritence(*this, Ancestor);
+
+  // The flags stand before the constructor runs, as for a root.
+  auto* Instance = static_cast<TComponent*>(Ancestor->ClassType()->Compiled->NewInstance());
+  Instance->SetDesigning(true, true);
+  Instance->SetInline(true);
+  Instance->SetDesignInstance(true);
+  RunConstructor(Instance, Owner); // a failing constructor frees the instance
+  bool SavedFrameManagers = FCreateFrameManagers;
+  try {
+    FModifiableFrames.push_back(Instance);
+    FInliningComponents[Instance] = Ancestor;
+    if (TRootHooks::ChangeToProxyClass) TRootHooks::ChangeToProxyClass(Instance, ComponentClass);
+    FCreateFrameManagers = false;
+    if (!TRootHooks::ReadObjectFromStream) RaiseServiceNotAvailable("Reading a nested frame");
+    TObjectGuard<TMemoryStream> Image(new TMemoryStream);
+    {
+      TObjectGuard<TWriter> Writer(new TWriter(Image.Get(), 4096));
+      Writer->WriteDescendent(Ancestor, nullptr);
+    } // the writer flushes as it goes
+    Image->SetPosition(0);
+    TRootHooks::ReadObjectFromStream(*this, Instance, Image.Get());
+    FCreateFrameManagers = SavedFrameManagers;
+    FrameComponentAdded(Instance);
+    for (int I = 0; I < Instance->ComponentCount(); ++I) {
+      Instance->Components(I)->SetAncestor(true);
+      FrameComponentAdded(Instance->Components(I));
+    }
+    if (SavedFrameManagers && TRootHooks::CreateUpdateManager)
+      if (IPtr<IUpdateManager> Manager =
+              TRootHooks::CreateUpdateManager(*this, Instance, Ancestor, Module->GetUpdateManager()))
+        FUpdateManagers->Add(QueryAs<IInterface>(Manager));
+  } catch (...) {
+    FCreateFrameManagers = SavedFrameManagers;
+    FModifiableFrames.erase(std::remove(FModifiableFrames.begin(), FModifiableFrames.end(), Instance),
+                            FModifiableFrames.end());
+    FInliningComponents.erase(Instance);
+    Instance->Destroy();
+    throw;
+  }
+  return Instance;
 }
 
 } // namespace formkit

@@ -42,6 +42,14 @@ struct FK_API TRootHooks {
   static std::function<void(TComponentRoot& Root, bool DoAll)> DeleteSelection;
   /// Writes the module and its dependencies (used by `Save`).
   static std::function<void(TComponentRoot& Root)> SaveModule;
+  /// Whether a class is the proxy class of a module (nested frames are made from them).
+  static std::function<bool(TClass Class)> IsProxyClass;
+  /// Moves an instance to a proxy class.
+  static std::function<void(TComponent* Instance, TClass ProxyClass)> ChangeToProxyClass;
+  /// Raises when a module cannot inherit from `Ancestor`.
+  static std::function<void(TComponentRoot& Root, TComponent* Ancestor)> ValidateInheritence;
+  /// Reads component data from `Stream` into `Instance` (a root or a nested frame).
+  static std::function<void(TComponentRoot& Root, TComponent* Instance, TStream* Stream)> ReadObjectFromStream;
 };
 
 /// Raises `EComponentDesignerException` "%s is not available" for the named service.

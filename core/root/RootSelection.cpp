@@ -222,8 +222,11 @@ void TComponentRoot::InstanceRemoved(TPersistent* Instance) {
   }
   if (IPtr<IDesignEnvironment> Env = GetEnvironment()) Env->ItemDeleted(AsDesigner(), Instance);
   if (auto* Component = dynamic_cast<TComponent*>(Instance)) {
+    if (IsModifiableFrame(Component) && FSurface)
+      for (int I = 0; I < Component->ComponentCount(); ++I) FSurface->ItemRemoved(Component->Components(I));
     for (size_t I = FModifiableFrames.size(); I-- > 0;)
       if (FModifiableFrames[I] == Component) FModifiableFrames.erase(FModifiableFrames.begin() + static_cast<std::ptrdiff_t>(I));
+    FInliningComponents.erase(Component);
   }
   for (auto& Listener : DesignNotificationListeners()) Listener->ItemDeleted(AsDesigner(), Instance);
   FreeRootStream();

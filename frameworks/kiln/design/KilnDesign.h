@@ -142,6 +142,7 @@ protected:
   TComponent* GetControl(TComponent* Component, int Index) override;
   bool IsControl(TComponent* Component) override;
   TComponent* GetParent(TComponent* Component) override;
+  void FrameComponentAdded(TComponent* Component) override;
 
 private:
   void LinkDesigner(TComponent* Instance, bool Link);

@@ -114,6 +114,12 @@ TComponent* TKilnRoot::GetParent(TComponent* Component) {
   return Control ? Control->Parent() : nullptr;
 }
 
+void TKilnRoot::FrameComponentAdded(TComponent* Component) {
+  // What a nested frame brings shows on the surface like the module's own components;
+  // a non-visual one gets its icon.
+  if (FKilnSurface && !dynamic_cast<TControl*>(Component)) FKilnSurface->UpdateSurface();
+}
+
 TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root) {
   auto Internal = QueryAs<IInternalRoot>(Root);
   auto* Kiln = Internal ? dynamic_cast<TKilnRoot*>(Internal->Implementor()) : nullptr;
