@@ -14,7 +14,7 @@ release: deps
 	cmake --build --preset release
 
 bench: release
-	@for b in build/release/bench/fk_bench_*; do echo "== $$b"; $$b --benchmark_min_time=0.2; done
+	@for b in build/release/bench/*/fk_bench_*; do echo "== $$b"; $$b --benchmark_min_time=0.2; done
 
 clean:
 	rm -rf build
