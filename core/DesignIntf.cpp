@@ -85,6 +85,7 @@ TEventInfo::TEventInfo(PPropInfo PropInfo) { Initialize(GetTypeData(PropInfo->Pr
 TEventInfo::TEventInfo(const TTypeData* TypeData) { Initialize(TypeData); }
 
 void TEventInfo::Initialize(const TTypeData* TypeData) {
+  if (!TypeData) throw EArgumentException(SInvalidMethodData);
   const auto& Bytes = TypeData->MethodData;
   size_t Pos = 0;
   auto Byte = [&]() -> std::uint8_t {

@@ -53,6 +53,7 @@ TEST(EventInfo, DescribesParametersFlagsAndResult) {
   Raw.MethodData = {std::uint8_t(mkFunction | 16), 0, 0};
   IPtr<IEventInfo> Cleared = NewAs<IEventInfo, TEventInfo>(&Raw);
   EXPECT_EQ(Cleared->GetMethodKind(), mkFunction);
+  EXPECT_THROW(New<TEventInfo>(static_cast<const TTypeData*>(nullptr)), EArgumentException);
   Raw.MethodData = {0, 2, 0, 3, 'a'};
   try {
     New<TEventInfo>(&Raw);

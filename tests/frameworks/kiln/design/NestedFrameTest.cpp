@@ -63,6 +63,14 @@ TEST_F(NestedFrameTest, AProxyClassBecomesANestedInstanceOfItsModule) {
   EXPECT_EQ(Calls, (std::vector<String>{"ChangeToProxyClass(TFrame1)", "ReadObjectFromStream"}));
   // Its components can be selected on the form, since the form may change the frame.
   EXPECT_TRUE(Form->Surface()->ItemFromComponent(Frame->Components(0))->Selectable());
+  // The host's flat list reaches into the frame: the frame, then what it holds.
+  EXPECT_EQ(Form->GetCompCount(), 2);
+  EXPECT_EQ(Form->GetCompName(0), "Frame1");
+  EXPECT_EQ(Form->GetCompName(1), "Frame1.Button1");
+  EXPECT_EQ(Form->CompIndexToComponent(1), Frame->Components(0));
+  // A component of a nested frame that the ancestor introduced keeps its name.
+  EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Frame->Components(0)->SetName("Other"); }),
+            "Cannot rename component Button1, component was introduced in an ancestor form");
 
   // Gone from the form, it leaves the frame lists.
   Frame->Destroy();
