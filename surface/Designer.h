@@ -198,6 +198,9 @@ struct FK_API IGrabHandles : IInterface {
   virtual IPtr<IItem> GetAttachedItem() = 0;
   /// Puts the handles on `Item`, or with null takes them away.
   virtual void AttachHandles(const IPtr<IItem>& Item) = 0;
+  /// Active handles may be dragged; inactive ones (another module is active, or the
+  /// controls are locked) are only shown.
+  virtual void SetHandlesActive(bool Value) = 0;
   /// The edges that the handle under a surface point moves; empty off the handles.
   /// The surface uses it to fill the `Affects` of a press.
   virtual TMoveAffects HandleAtPoint(int X, int Y) = 0;

@@ -345,8 +345,9 @@ void TComponentRoot::Close() {
 
 void TComponentRoot::SetActive(bool Value) {
   if (FSurface)
-    if (IPtr<IGrabHandles> Handles = FSurface->GetGrabHandles()) Handles->RefreshHandles();
-  (void)Value;
+    if (IPtr<IGrabHandles> Handles = FSurface->GetGrabHandles())
+      Handles->SetHandlesActive(Value && !(FSurfaceDesigner && FSurfaceDesigner->GetLocked()));
+  SetActiveView(AsRoot());
 }
 
 void TComponentRoot::SetControlsLocked(bool Value) {

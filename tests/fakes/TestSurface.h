@@ -131,6 +131,9 @@ class TRecordingGrabHandles : public TInterfacedObject, public IGrabHandles {
   explicit TRecordingGrabHandles(TCallLog* Log = nullptr) : FLog(Log) {}
   IPtr<IItem> GetAttachedItem() override { return Attached; }
   void AttachHandles(const IPtr<IItem>& Item) override;
+  void SetHandlesActive(bool Value) override {
+    if (FLog) FLog->Add(Value ? "SetHandlesActive(True)" : "SetHandlesActive(False)");
+  }
   TMoveAffects HandleAtPoint(int, int) override { return {}; }
   void RefreshHandles() override {
     if (FLog) FLog->Add("RefreshHandles");

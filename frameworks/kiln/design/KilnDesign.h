@@ -228,12 +228,16 @@ class FK_API TKilnGrabHandles : public TInterfacedObject, public IGrabHandles {
   explicit TKilnGrabHandles(TKilnSurface* Surface = nullptr) : FSurface(Surface) {}
   IPtr<IItem> GetAttachedItem() override { return FItem; }
   void AttachHandles(const IPtr<IItem>& Item) override;
+  void SetHandlesActive(bool Value) override;
+  bool Active() const noexcept { return FActive; }
+  /// Off the handles when they are inactive.
   TMoveAffects HandleAtPoint(int X, int Y) override;
   void RefreshHandles() override;
 
 private:
   TKilnSurface* FSurface;
   IPtr<IItem> FItem;
+  bool FActive = true;
 };
 
 /// Drag boxes drawn on the surface's canvas.

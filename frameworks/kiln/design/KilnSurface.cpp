@@ -50,8 +50,13 @@ TRect HandleRect(TPoint C) {
 }
 } // namespace
 
+void TKilnGrabHandles::SetHandlesActive(bool Value) {
+  FActive = Value;
+  RefreshHandles();
+}
+
 TMoveAffects TKilnGrabHandles::HandleAtPoint(int X, int Y) {
-  if (!FItem) return {};
+  if (!FItem || !FActive) return {};
   for (const THandle& H : HandlesAround(SurfaceBounds(FItem)))
     if (HandleRect(H.Center).Contains({X, Y})) return H.Affects;
   return {};
@@ -59,7 +64,11 @@ TMoveAffects TKilnGrabHandles::HandleAtPoint(int X, int Y) {
 
 void TKilnGrabHandles::RefreshHandles() {
   if (!FItem || !FSurface) return;
-  for (const THandle& H : HandlesAround(SurfaceBounds(FItem))) FSurface->Canvas()->FillRect(HandleRect(H.Center));
+  // Active handles are filled; inactive ones only framed.
+  for (const THandle& H : HandlesAround(SurfaceBounds(FItem))) {
+    if (FActive) FSurface->Canvas()->FillRect(HandleRect(H.Center));
+    else FSurface->Canvas()->FrameRect(HandleRect(H.Center));
+  }
 }
 
 //===----------------------------------------------------------------------===//

@@ -58,6 +58,23 @@ TEST_F(ModuleTest, HandlesStandOnASingleSelectionAndMarksOnSeveral) {
   EXPECT_EQ(Log.Count("ItemDeleted(Button2)"), 1); // the host was told
 }
 
+TEST_F(ModuleTest, HandlesAreActiveOnlyOnTheActiveUnlockedModule) {
+  Kiln->Select(B, false);
+  auto* Handles = static_cast<TKilnGrabHandles*>(Kiln->Surface()->GetGrabHandles().Get());
+  TRect Bounds = static_cast<TControl*>(B)->BoundsRect();
+  TMoveAffects Corner{gaRight, gaBottom};
+  EXPECT_EQ(Handles->HandleAtPoint(Bounds.Right, Bounds.Bottom), Corner);
+  Kiln->SetActive(false);
+  EXPECT_FALSE(Handles->Active());
+  EXPECT_TRUE(Handles->HandleAtPoint(Bounds.Right, Bounds.Bottom).Empty());
+  Kiln->SetControlsLocked(true);
+  Kiln->SetActive(true);
+  EXPECT_FALSE(Handles->Active()); // locked controls show their handles, inactive
+  Kiln->SetControlsLocked(false);
+  Kiln->SetActive(true);
+  EXPECT_TRUE(Handles->Active());
+}
+
 TEST_F(ModuleTest, ListsComingBackDuringABatchAreIgnored) {
   IPtr<IDesignerSelections> List = CreateSelectionList();
   List->Add(B);
