@@ -497,3 +497,107 @@ TEST_F(DesignCoreFixture, TopLevelComponentFollowsTheActiveWindowThenZOrder) {
   TWindowList::SetWindows({});
   for (TComponent* X : {A, B, C}) X->Destroy();
 }
+
+//===----------------------------------------------------------------------===//
+// Finding, opening and ordering roots
+//===----------------------------------------------------------------------===//
+
+TEST_F(DesignCoreFixture, OpenRootClassFindsOrAsksTheHostAndResurrects) {
+  auto Env = New<TRecordingEnvironment>(&Log);
+  auto Designer = MakeDesigner(".kfm", Env);
+  Designers()->RegisterDesigner(AsDesigner(Designer));
+  auto Form1 = Designer->AddRoot("Form1", &Log);
+  Form1->Dormant = true;
+  Log.Clear();
+  // The leading T goes; a dormant root comes back.
+  EXPECT_EQ(Designer->OpenRootClass("TForm1"), AsRoot(Form1));
+  EXPECT_FALSE(Form1->Dormant);
+  EXPECT_EQ(Log.Calls, std::vector<String>{"Form1.Resurrect"});
+
+  // Not open: the host is asked to open it, and the search runs again.
+  IPtr<TFakeRoot> Opened;
+  Env->OnOpenModuleByName = [&](const String& Name) { Opened = Designer->AddRoot(Name, &Log); };
+  Log.Clear();
+  IPtr<IRoot> Found = Designer->OpenRootClass("TUnit2");
+  EXPECT_EQ(Log.Calls.front(), "OpenModuleByName(Unit2)");
+  EXPECT_EQ(Found, AsRoot(Opened));
+  Env->OnOpenModuleByName = nullptr;
+  EXPECT_EQ(Designer->OpenRootClass("TNowhere"), nullptr);
+
+  // Another designer's roots are found by name and by component, after this one's own.
+  auto Other = MakeDesigner(".sfm", Env);
+  Designers()->RegisterDesigner(AsDesigner(Other));
+  auto Far = Other->AddRoot("FarForm", &Log);
+  EXPECT_EQ(Designer->FindRoot(String("farform")), AsRoot(Far));
+  EXPECT_EQ(Designer->FindRoot(Far->RootComponent()), AsRoot(Far));
+  IPtr<IRoot> ByFile;
+  EXPECT_TRUE(Designers()->FindFile("FarForm.kfm", ByFile));
+  EXPECT_EQ(ByFile, AsRoot(Far));
+  std::vector<String> Names;
+  Designer->GetRootNames([&](const String& N) { Names.push_back(N); });
+  EXPECT_EQ(Names, (std::vector<String>{"Form1", "Unit2"}));
+  for (auto& R : {Form1, Opened}) Designer->RootListRemove(AsRoot(R));
+  Other->RootListRemove(AsRoot(Far));
+  Designers()->UnregisterDesigner(AsDesigner(Other));
+  Designers()->UnregisterDesigner(AsDesigner(Designer));
+}
+
+TEST_F(DesignCoreFixture, RootsWithoutAncestorsComeFirstBeforeDependenciesAreDropped) {
+  auto Designer = MakeDesigner(".kfm");
+  auto A = Designer->AddRoot("A", &Log);
+  auto B = Designer->AddRoot("B", &Log);
+  auto C = Designer->AddRoot("C", &Log);
+  auto D = Designer->AddRoot("D", &Log);
+  A->Ancestor = AsRoot(D); // A and C inherit; B and D do not
+  C->Ancestor = AsRoot(D);
+  Log.Clear();
+  Designer->RemoveDependenciesOn(nullptr);
+  std::vector<String> Order;
+  for (int I = 0; I < Designer->GetRootsCount(); ++I) Order.push_back(Designer->GetRoots(I)->GetRootName());
+  EXPECT_EQ(Order, (std::vector<String>{"B", "D", "C", "A"}));
+  EXPECT_EQ(Log.Calls, (std::vector<String>{"B.RemoveDependenciesOn", "D.RemoveDependenciesOn",
+                                            "C.RemoveDependenciesOn", "A.RemoveDependenciesOn"}));
+  A->Ancestor = C->Ancestor = nullptr;
+  for (auto& R : {A, B, C, D}) Designer->RootListRemove(AsRoot(R));
+}
+
+namespace {
+class TWindowListener : public TListener, public IDesignWindow {
+  FK_CLASS(TWindowListener, TListener)
+  FK_INTERFACES(IDesignWindow)
+  using TListener::TListener;
+  void ItemDeleted(const IPtr<IDesigner>& D, TPersistent* I) override { TListener::ItemDeleted(D, I); }
+  void ItemInserted(const IPtr<IDesigner>& D, TPersistent* I) override { TListener::ItemInserted(D, I); }
+  void ItemsModified(const IPtr<IDesigner>& D) override { TListener::ItemsModified(D); }
+  void SelectionChanged(const IPtr<IDesigner>& D, const IPtr<IDesignerSelections>& S) override {
+    TListener::SelectionChanged(D, S);
+  }
+  void DesignerOpened(const IPtr<IDesigner>& D, bool R) override { TListener::DesignerOpened(D, R); }
+  void DesignerClosed(const IPtr<IDesigner>& D, bool G) override { TListener::DesignerClosed(D, G); }
+  void WindowHide() override { Log->Add(Name + ".WindowHide"); }
+  void WindowShow() override { Log->Add(Name + ".WindowShow"); }
+};
+} // namespace
+FK_IMPLEMENT(TWindowListener, "Tests") {}
+
+TEST_F(DesignCoreFixture, HidingWindowsTellsDesignWindowsLastFirstThenEachRootInOrder) {
+  auto Designer = MakeDesigner(".kfm");
+  Designers()->RegisterDesigner(AsDesigner(Designer));
+  auto W1 = New<TWindowListener>("W1", &Log), W2 = New<TWindowListener>("W2", &Log);
+  auto Plain = New<TPlainListener>(&Log);
+  RegisterDesignNotification(InterfaceOf<IDesignNotification>(W1.Get()));
+  RegisterDesignNotification(InterfaceOf<IDesignNotification>(Plain.Get()));
+  RegisterDesignNotification(InterfaceOf<IDesignNotification>(W2.Get()));
+  auto A = Designer->AddRoot("A", &Log), B = Designer->AddRoot("B", &Log);
+  Log.Clear();
+  Designers()->HideWindows();
+  EXPECT_EQ(Log.Calls, (std::vector<String>{"W2.WindowHide", "W1.WindowHide", "A.HideForModule", "B.HideForModule"}));
+  Log.Clear();
+  Designers()->ShowWindows();
+  EXPECT_EQ(Log.Calls, (std::vector<String>{"W2.WindowShow", "W1.WindowShow", "A.ShowForModule", "B.ShowForModule"}));
+  Designers()->SetControlsLocked(true);
+  EXPECT_TRUE(A->Locked && B->Locked);
+  EXPECT_TRUE(Designers()->GetControlsLocked());
+  for (auto& R : {A, B}) Designer->RootListRemove(AsRoot(R));
+  Designers()->UnregisterDesigner(AsDesigner(Designer));
+}

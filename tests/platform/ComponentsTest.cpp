@@ -298,3 +298,47 @@ TEST(Names, FindComponentAgreesWithAReferenceThroughRenamesAndRemovals) {
   EXPECT_EQ(Owner->FindComponent("Item600"), nullptr);
   Owner->Destroy();
 }
+
+namespace {
+/// Counts the updates its collection reports.
+class TCountingCollection : public TOwnedCollection {
+  FK_CLASS(TCountingCollection, TOwnedCollection)
+  using TOwnedCollection::TOwnedCollection;
+  std::vector<TCollectionItem*> Updates;
+
+protected:
+  void Update(TCollectionItem* Item) override { Updates.push_back(Item); }
+};
+FK_IMPLEMENT(TCountingCollection, "Tests") {}
+} // namespace
+
+TEST(Collections, ChangesAreReportedOnceAfterABatchAndItemsMove) {
+  TObjectGuard<TCountingCollection> Items(new TCountingCollection(nullptr, TSampleItem::StaticClass()));
+  TCollectionItem* First = Items->Add();
+  EXPECT_EQ(Items->Updates, std::vector<TCollectionItem*>{nullptr});
+  Items->Updates.clear();
+  Items->BeginUpdate();
+  Items->Add();
+  Items->Add();
+  Items->BeginUpdate();
+  Items->Delete(1);
+  Items->EndUpdate();
+  EXPECT_TRUE(Items->Updates.empty()); // inside the outer batch nothing is told
+  Items->EndUpdate();
+  EXPECT_EQ(Items->Updates, std::vector<TCollectionItem*>{nullptr});
+  Items->Updates.clear();
+  // Moving an item reports a change of all; moving to an index out of range is refused.
+  TCollectionItem* Last = Items->Items(1);
+  Last->SetIndex(0);
+  EXPECT_EQ(Items->Items(0), Last);
+  EXPECT_EQ(First->Index(), 1);
+  EXPECT_EQ(Items->Updates, std::vector<TCollectionItem*>{nullptr});
+  EXPECT_EQ(MessageOf<EListError>([&] { Last->SetIndex(5); }), "List index out of bounds (5)");
+  EXPECT_EQ(Last->Index(), 0);
+  // An item moved into another collection leaves the first.
+  TObjectGuard<TCountingCollection> Other(new TCountingCollection(nullptr, TSampleItem::StaticClass()));
+  First->SetCollection(Other.Get());
+  EXPECT_EQ(Items->Count(), 1);
+  EXPECT_EQ(Other->Items(0), First);
+  EXPECT_EQ(Items->FindItemID(First->ID()), nullptr);
+}

@@ -1,6 +1,8 @@
 //===- tests/platform/InterfacesTest.cpp - Counted interfaces ------------===//
 #include "platform/Lists.h"
 
+#include <thread>
+
 #include <gtest/gtest.h>
 
 using namespace formkit;
@@ -163,4 +165,24 @@ TEST(Interfaces, InterfaceListComparesByIdentityUnderItsLock) {
   List->Clear();
   EXPECT_EQ(List->GetCount(), 0);
   EXPECT_EQ(A->RefCount(), 1);
+}
+
+TEST(Interfaces, InterfaceListKeepsItsCountsUnderTwoThreads) {
+  IPtr<IInterfaceList> List = NewAs<IInterfaceList, TInterfaceList>();
+  IPtr<TGreeter> Shared = New<TGreeter>();
+  IPtr<IInterface> Item = QueryAs<IInterface>(QueryAs<ICounter>(Shared.Get()));
+  auto Work = [&] {
+    for (int I = 0; I < 2000; ++I) {
+      List->Add(Item);
+      List->Lock(); // a read and a delete as one step
+      if (List->GetCount() > 0) List->Delete(List->GetCount() - 1);
+      List->Unlock();
+    }
+  };
+  std::thread A(Work), B(Work);
+  A.join();
+  B.join();
+  EXPECT_EQ(List->GetCount(), 0);
+  Item = nullptr;
+  EXPECT_EQ(Shared->RefCount(), 1); // every reference the list took was given back
 }
