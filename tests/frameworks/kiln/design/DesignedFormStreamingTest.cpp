@@ -1,0 +1,69 @@
+//===- tests/frameworks/kiln/design/DesignedFormStreamingTest.cpp - A designed form as a file ===//
+#include "platform/Filer.h"
+#include "tests/frameworks/kiln/design/KilnDesignFixture.h"
+
+using namespace formkit;
+using namespace formkit::fakes;
+
+namespace {
+/// The form as component data: signature and tree, written against `Ancestor` when given.
+String Image(TComponent* Root, TComponent* Ancestor = nullptr) {
+  TObjectGuard<TMemoryStream> Data(new TMemoryStream);
+  {
+    TObjectGuard<TWriter> Writer(new TWriter(Data.Get(), 4096));
+    Writer->WriteDescendent(Root, Ancestor);
+  }
+  Data->SetPosition(0);
+  TObjectGuard<TMemoryStream> Text(new TMemoryStream);
+  ObjectBinaryToText(Data.Get(), Text.Get());
+  return String(reinterpret_cast<const char*>(Text->Memory()), static_cast<size_t>(Text->Size()));
+}
+} // namespace
+
+TEST_F(KilnDesignFixture, AFormBuiltOnTheSurfaceRoundTripsAndWritesOnlyItsEdits) {
+  Env->Options.UseDesignerGuidelines = false;
+  IPtr<IRoot> Root = NewForm("Form1");
+  TKilnRoot* Kiln = KilnRoot(Root);
+  TKilnSurface* S = KilnSurfaceOf(Root);
+  Arm(TPanel::StaticClass());
+  Drag(S, {16, 16}, {216, 112});
+  Arm(TButton::StaticClass());
+  Drag(S, {40, 40}, {120, 64});
+  Arm(nullptr);
+  Kiln->CreateComponentPos(NewAs<IInternalPaletteItem, TToolItem>(TTimer::StaticClass()), 300, 300);
+  TComponent* Form = Root->GetRoot();
+  String Original = Image(Form);
+  EXPECT_NE(Original.find("object Form1: TForm"), String::npos);
+  EXPECT_NE(Original.find("object Panel1: TPanel"), String::npos);
+  EXPECT_NE(Original.find("object Button1: TButton"), String::npos);
+  EXPECT_NE(Original.find("object Timer1: TTimer"), String::npos);
+
+  // Read back into a fresh form: the same tree, the same file.
+  TObjectGuard<TMemoryStream> Data(new TMemoryStream);
+  {
+    TObjectGuard<TWriter> Writer(new TWriter(Data.Get(), 4096));
+    Writer->WriteDescendent(Form, nullptr);
+  }
+  Data->SetPosition(0);
+  TObjectGuard<TForm> Copy(CreateComponentOf<TForm>(nullptr));
+  {
+    TObjectGuard<TReader> Reader(new TReader(Data.Get(), 4096));
+    Reader->ReadRootComponent(Copy.Get());
+  }
+  ASSERT_EQ(Copy->ComponentCount(), 3);
+  auto* Button = static_cast<TControl*>(Copy->FindComponent("Button1"));
+  ASSERT_NE(Button, nullptr);
+  EXPECT_EQ(Button->Parent(), Copy->FindComponent("Panel1"));
+  EXPECT_EQ(Button->BoundsRect(), static_cast<TControl*>(Form->FindComponent("Button1"))->BoundsRect());
+  EXPECT_EQ(Copy->FindComponent("Timer1")->DesignInfo(), Form->FindComponent("Timer1")->DesignInfo());
+  EXPECT_EQ(Image(Copy.Get()), Original);
+
+  // Nudged on the surface, the module differs from the copy in the button's left only.
+  Kiln->Select(Form->FindComponent("Button1"), false);
+  S->KeyDown(dkRight, {ssCtrl});
+  String Difference = Image(Form, Copy.Get());
+  EXPECT_NE(Difference.find("inherited Button1: TButton"), String::npos);
+  EXPECT_NE(Difference.find("Left = "), String::npos);
+  EXPECT_EQ(Difference.find("Top = "), String::npos);
+  EXPECT_EQ(Difference.find("object "), String::npos); // nothing new
+}
