@@ -601,3 +601,47 @@ TEST_F(DesignCoreFixture, HidingWindowsTellsDesignWindowsLastFirstThenEachRootIn
   for (auto& R : {A, B}) Designer->RootListRemove(AsRoot(R));
   Designers()->UnregisterDesigner(AsDesigner(Designer));
 }
+
+namespace {
+struct TThrowingSink : TObject {
+  void RootActivated(TObject*, const IPtr<ICustomModule>&) { throw EComponentDesignerException("handler failed"); }
+};
+} // namespace
+
+TEST_F(DesignCoreFixture, AFailingHandlerStillClosesThePalettesBatch) {
+  TThrowingSink Throwing;
+  EvRootActivatedEvent->Add(TRootActivatedEvent::Bind<&TThrowingSink::RootActivated>(&Throwing));
+  Log.Clear();
+  EXPECT_THROW(EvRootActivatedEvent->Send(nullptr, StubCustomModule()), EComponentDesignerException);
+  EXPECT_EQ(Log.Calls, (std::vector<String>{"Palette.BeginUpdate", "Palette.Add(NativeDesignerActive)",
+                                            "Palette.Remove(CodeEditorActive)", "Palette.EndUpdate"}));
+  EvRootActivatedEvent->Remove(TRootActivatedEvent::Bind<&TThrowingSink::RootActivated>(&Throwing));
+  // Without the host's service object the handlers are still called.
+  HalvernIDEServices = nullptr;
+  Log.Clear();
+  EvRootActivatedEvent->Send(nullptr, nullptr);
+  EXPECT_EQ(Log.Calls, std::vector<String>{"RootActivated(nil,nil)"});
+}
+
+TEST_F(DesignCoreFixture, TopLevelHandlersAreAskedInOrderUntilOneAnswers) {
+  auto First = New<TWindowHandler>(), Second = New<TWindowHandler>();
+  TComponent* A = CreateComponentOf<TComponent>(nullptr);
+  TComponent* B = CreateComponentOf<TComponent>(nullptr);
+  A->SetName("A");
+  B->SetName("B");
+  First->Windows = {{1, A}};
+  Second->Windows = {{1, B}, {2, B}};
+  RegisterHandler(InterfaceOf<ITopLevelsHandler>(First.Get()));
+  RegisterHandler(InterfaceOf<ITopLevelsHandler>(Second.Get()));
+  EXPECT_EQ(ComponentFromWindow(1), A); // the first that knows the window
+  EXPECT_EQ(ComponentFromWindow(2), B);
+  EXPECT_EQ(ComponentFromWindow(0), nullptr);
+  EXPECT_EQ(CaptionFromComponent(B), "Window of B");
+  EXPECT_FALSE(IsComponentDesigner(A));
+  EXPECT_TRUE(TopLevelComponents().empty());
+  UnregisterHandler(InterfaceOf<ITopLevelsHandler>(First.Get()));
+  EXPECT_EQ(ComponentFromWindow(1), B);
+  UnregisterHandler(InterfaceOf<ITopLevelsHandler>(Second.Get()));
+  A->Destroy();
+  B->Destroy();
+}
