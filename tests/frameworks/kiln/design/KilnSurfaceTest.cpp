@@ -111,3 +111,16 @@ TEST_F(KilnSurfaceTest, ADoubleClickEditsThroughTheComponentEditor) {
   Kiln->Edit(Panel);
   EXPECT_EQ(Edits, (std::vector<String>{"Button1", "Button1", "Panel1"}));
 }
+
+TEST_F(KilnDesignFixture, AnEmptyModuleHasNothingToWalkOrHit) {
+  IPtr<IRoot> Root = NewForm("Form1");
+  TKilnSurface* S = KilnSurfaceOf(Root);
+  EXPECT_EQ(S->GetItemsCount(), 0);
+  EXPECT_EQ(S->FindNextItem(nullptr, true), nullptr);
+  S->KeyDown(dkTab); // nothing to select: the root stays the selection
+  EXPECT_EQ(KilnRoot(Root)->GetSelection()->Get(0), Root->GetRoot());
+  EXPECT_EQ(ExtractComponent(S->ItemAtPoint(5, 5)), Root->GetRoot());
+  EXPECT_TRUE(S->GetGrabHandles()->HandleAtPoint(5, 5).Empty());
+  EXPECT_EQ(S->GetRoot()->GetBoundsRect(), Rect(0, 0, 640, 480)); // a new form's client area
+  EXPECT_EQ(S->GetRoot()->GetParent(), nullptr);
+}
