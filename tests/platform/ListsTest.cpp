@@ -134,3 +134,25 @@ TEST(PointerList, IndexErrorsAndMoves) {
     EXPECT_EQ(E.Message(), "List index out of bounds (2)");
   }
 }
+
+TEST(StringList, ExchangeAndMoveCarryEachLinesObject) {
+  TStringList List;
+  TStringList A, B, C; // stand-ins for the objects of the lines
+  List.AddObject("a", &A);
+  List.AddObject("b", &B);
+  List.AddObject("c", &C);
+  List.Exchange(0, 2);
+  EXPECT_EQ(List.CommaText(), "c,b,a");
+  EXPECT_EQ(List.GetObject(0), &C);
+  EXPECT_EQ(List.GetObject(2), &A);
+  List.Move(0, 1);
+  EXPECT_EQ(List.CommaText(), "b,c,a");
+  EXPECT_EQ(List.GetObject(1), &C);
+  EXPECT_EQ(List.IndexOfObject(&A), 2);
+  // A sorted list keeps its order: a line cannot be put in place.
+  List.SetSorted(true);
+  EXPECT_EQ(List.CommaText(), "a,b,c");
+  EXPECT_EQ(List.GetObject(0), &A);
+  EXPECT_THROW(List.Exchange(0, 1), EStringListError);
+  EXPECT_EQ(List.CommaText(), "a,b,c");
+}
