@@ -3,6 +3,8 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <cstdlib>
+#include <unordered_set>
 
 namespace formkit {
 
@@ -31,15 +33,32 @@ void TPersistent::AssignError(TPersistent* Source) {
 
 String TPersistent::GetNamePath() { return ClassName(); }
 
+void TPersistent::BeforeDestruction() {
+  if (FPendingReferences) detail::ForgetPendingReferences(this);
+  inherited::BeforeDestruction();
+}
+
 void TPersistent::DefineProperties(TFiler*) {}
 
 //===----------------------------------------------------------------------===//
 // TComponent
 //===----------------------------------------------------------------------===//
 
-std::function<void(const String&, int)> DanglingComponentReferenceHook = [](const String& ClassName, int Count) {
+namespace {
+void ReportDanglingReference(const String& ClassName, int Count) {
   std::fprintf(stderr, "%s\n", Format(LoadResString(SDanglingReference), ClassName, Count).c_str());
-};
+}
+using TDanglingHook = void (*)(const String&, int);
+} // namespace
+
+std::function<void(const String&, int)> DanglingComponentReferenceHook = ReportDanglingReference;
+
+namespace {
+[[maybe_unused]] bool DanglingComponentReferenceHookReplaced() {
+  const TDanglingHook* Target = DanglingComponentReferenceHook.target<TDanglingHook>();
+  return !Target || *Target != &ReportDanglingReference;
+}
+} // namespace
 
 FK_IMPLEMENT(TComponent, "Classes") {
   B.Property("Name", &TComponent::Name, &TComponent::SetName).Stored(false);
@@ -86,6 +105,98 @@ void TComponent::IndexName(TComponent* Component) {
 void TComponent::UnindexName(TComponent* Component) {
   if (!Component->FName.empty()) FNameIndex.Erase(Component);
 }
+
+//===----------------------------------------------------------------------===//
+// Interface references to components
+//===----------------------------------------------------------------------===//
+
+namespace detail {
+/// The counted stand-in of one component. The component knows its wrapper (to cut the
+/// link when it goes); the wrapper knows its component until then.
+class TComponentReference : public TInterfacedObject, public IComponentReference {
+  FK_CLASS(TComponentReference, TInterfacedObject)
+  FK_INTERFACES(IComponentReference)
+
+  explicit TComponentReference(TComponent* Component) : FComponent(Component) {}
+  TComponent* GetComponent() override { return FComponent; }
+  /// Called by the component's teardown.
+  void ComponentGone() noexcept { FComponent = nullptr; }
+  void BeforeDestruction() override {
+    if (FComponent) FComponent->FReference = nullptr;
+    inherited::BeforeDestruction();
+  }
+
+private:
+  TComponent* FComponent; // plain back reference, cleared by the component's teardown
+};
+FK_IMPLEMENT(TComponentReference, "Classes") {}
+} // namespace detail
+
+IPtr<IComponentReference> ComponentReference(TComponent* Component) {
+  if (!Component) return nullptr;
+  if (Component->FReference) return IPtr<IComponentReference>(Component->FReference);
+  IPtr<detail::TComponentReference> Ref = New<detail::TComponentReference>(Component);
+  Component->FReference = Ref.Get();
+  return Ref;
+}
+
+TComponent* ReferencedComponent(const IPtr<IInterface>& Reference) {
+  IPtr<IComponentReference> Ref = QueryAs<IComponentReference>(Reference);
+  return Ref ? Ref->GetComponent() : nullptr;
+}
+
+//===----------------------------------------------------------------------===//
+// Links of free notification
+//===----------------------------------------------------------------------===//
+
+namespace detail {
+void TComponentLinks::Add(TComponent* C) {
+  if (Contains(C)) return;
+  FItems.push_back(C);
+  if (FIndex) FIndex->emplace(C, FItems.size() - 1);
+  else if (FItems.size() > IndexFrom) BuildIndex();
+}
+
+bool TComponentLinks::Contains(TComponent* C) const noexcept {
+  if (FIndex) return FIndex->count(C) != 0;
+  return std::find(FItems.begin(), FItems.end(), C) != FItems.end();
+}
+
+bool TComponentLinks::Remove(TComponent* C) noexcept {
+  size_t At;
+  if (FIndex) {
+    auto It = FIndex->find(C);
+    if (It == FIndex->end()) return false;
+    At = It->second;
+    FIndex->erase(It);
+  } else {
+    auto It = std::find(FItems.begin(), FItems.end(), C);
+    if (It == FItems.end()) return false;
+    At = static_cast<size_t>(It - FItems.begin());
+  }
+  if (At + 1 != FItems.size()) {
+    FItems[At] = FItems.back();
+    if (FIndex) (*FIndex)[FItems[At]] = At;
+  }
+  FItems.pop_back();
+  if (FItems.empty()) FIndex.reset();
+  return true;
+}
+
+TComponent* TComponentLinks::PopBack() noexcept {
+  TComponent* C = FItems.back();
+  FItems.pop_back();
+  if (FIndex) FIndex->erase(C);
+  if (FItems.empty()) FIndex.reset();
+  return C;
+}
+
+void TComponentLinks::BuildIndex() {
+  FIndex = std::make_unique<std::unordered_map<TComponent*, size_t>>();
+  FIndex->reserve(FItems.size() * 2);
+  for (size_t I = 0; I < FItems.size(); ++I) FIndex->emplace(FItems[I], I);
+}
+} // namespace detail
 
 //===----------------------------------------------------------------------===//
 // The name index
@@ -232,7 +343,9 @@ void TComponent::Notification(TComponent* AComponent, TOperation Operation) {
   ForgetFreeNotification(AComponent);
   // Owned components hear of a removal, so that references between siblings can be
   // cleared. Insertions are told to the owner alone: telling every sibling would make
-  // filling an owner quadratic.
+  // filling an owner quadratic. While the owner goes, or its components leave together,
+  // they all go: none needs to hear of another.
+  if (FQuietRemovals || FComponentState.Contains(csDestroying)) return;
   for (size_t I = FComponents.size(); I-- > 0;) {
     if (I >= FComponents.size()) continue; // a handler may have removed components
     FComponents[I]->SendNotification(AComponent, Operation);
@@ -250,11 +363,8 @@ void TComponent::SendNotification(TComponent* AComponent, TOperation Operation) 
 
 void TComponent::FreeNotification(TComponent* AComponent) {
   if (!AComponent || AComponent == this) return;
-  auto Add = [](std::vector<TComponent*>& List, TComponent* C) {
-    if (std::find(List.begin(), List.end(), C) == List.end()) List.push_back(C);
-  };
-  Add(FFreeNotifies, AComponent);
-  Add(AComponent->FFreeNotifies, this);
+  FFreeNotifies.Add(AComponent);
+  AComponent->FFreeNotifies.Add(this);
   FComponentState.Include(csFreeNotification);
   AComponent->FComponentState.Include(csFreeNotification);
 }
@@ -266,9 +376,8 @@ void TComponent::RemoveFreeNotification(TComponent* AComponent) {
 }
 
 void TComponent::ForgetFreeNotification(TComponent* Component) {
-  auto It = std::find(FFreeNotifies.begin(), FFreeNotifies.end(), Component);
-  if (It != FFreeNotifies.end()) FFreeNotifies.erase(It);
-  if (FFreeNotifies.empty()) FComponentState.Exclude(csFreeNotification);
+  FFreeNotifies.Remove(Component);
+  if (FFreeNotifies.Empty()) FComponentState.Exclude(csFreeNotification);
 }
 
 void TComponent::Loaded() { FComponentState.Exclude(csLoading); }
@@ -312,17 +421,54 @@ void TComponent::Destroying() {
 
 void TComponent::BeforeDestruction() {
   // Tell everyone linked across owners, then free the owned components.
-  while (!FFreeNotifies.empty()) {
-    TComponent* Other = FFreeNotifies.back();
-    FFreeNotifies.pop_back();
+  while (!FFreeNotifies.Empty()) {
+    TComponent* Other = FFreeNotifies.PopBack();
     Other->ForgetFreeNotification(this);
     Other->SendNotification(this, opRemove);
   }
   FComponentState.Exclude(csFreeNotification);
   DestroyComponents();
   if (FOwner) FOwner->RemoveComponent(this);
-  if (FRefTally > 0 && DanglingComponentReferenceHook) DanglingComponentReferenceHook(ClassName(), FRefTally);
+  if (FReference) std::exchange(FReference, nullptr)->ComponentGone();
   inherited::BeforeDestruction();
+}
+
+void TComponent::FreeInstance() {
+  if (FRefTally <= 0) {
+    inherited::FreeInstance();
+    return;
+  }
+  // A plain interface reference outlived the component: a programming error. Say so, and
+  // keep the memory until that reference goes, so its release does not corrupt anything.
+  if (DanglingComponentReferenceHook) DanglingComponentReferenceHook(ClassName(), FRefTally);
+  FAwaitingRelease = true;
+#ifdef FK_ABORT_ON_DANGLING_REFERENCE
+  if (!DanglingComponentReferenceHookReplaced()) std::abort();
+#endif
+}
+
+int TComponent::ObjRelease() {
+  int Count = --FRefTally;
+  if (Count == 0 && FAwaitingRelease) delete this;
+  return Count;
+}
+
+void FreeComponentsTogether(const std::vector<TComponent*>& Components) {
+  std::unordered_set<TComponent*> Going(Components.begin(), Components.end());
+  for (TComponent* C : Components) C->Destroying();
+  // Owners that stay are quiet while their components leave; an owner that goes too is
+  // quiet already (it is destroying).
+  std::vector<TComponent*> Owners;
+  for (TComponent* C : Components)
+    if (TComponent* Owner = C->FOwner; Owner && !Going.count(Owner) && !Owner->FQuietRemovals) {
+      Owner->FQuietRemovals = true;
+      Owners.push_back(Owner);
+    }
+  // The owners' flags are cleared on the way out, also when a teardown throws.
+  auto Restore = Finally([&]() noexcept {
+    for (TComponent* Owner : Owners) Owner->FQuietRemovals = false;
+  });
+  for (TComponent* C : Components) C->Destroy();
 }
 
 TComponent* CreateComponent(TClass Class, TComponent* Owner) {

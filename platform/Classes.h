@@ -19,6 +19,9 @@
 
 #include "platform/TypInfo.h"
 
+#include <memory>
+#include <unordered_map>
+
 
 namespace formkit {
 
@@ -26,6 +29,12 @@ class TFiler;
 class TReader;
 class TWriter;
 class TCollection;
+class TPersistent;
+class TComponent;
+namespace detail {
+struct TPendingReferenceCount;
+class TComponentReference;
+} // namespace detail
 
 FK_EXCEPTION(EComponentError, Exception);
 FK_EXCEPTION(EClassNotFound, EComponentError);
@@ -60,11 +69,30 @@ class FK_API TPersistent : public TObject {
   virtual void DefineProperties(TFiler* Filer);
   /// The object this one belongs to for name paths; null at the top.
   virtual TPersistent* GetOwner() { return nullptr; }
+  /// Forgets the stream references still waiting to be written into this object.
+  void BeforeDestruction() override;
 
 protected:
   virtual void AssignTo(TPersistent* Dest);
   [[noreturn]] void AssignError(TPersistent* Source);
+
+private:
+  friend struct detail::TPendingReferenceCount;
+  /// How many unresolved references of a stream will write into this object: while it is
+  /// not zero, the object's teardown tells the fix-ups to forget them.
+  std::uint32_t FPendingReferences = 0;
 };
+
+namespace detail {
+/// Keeps `TPersistent`'s count of pending references; only the fix-ups use it.
+struct FK_API TPendingReferenceCount {
+  static void Add(TPersistent* Obj) noexcept { ++Obj->FPendingReferences; }
+  static void Drop(TPersistent* Obj) noexcept { --Obj->FPendingReferences; }
+  static std::uint32_t Of(const TPersistent* Obj) noexcept { return Obj->FPendingReferences; }
+};
+/// Called by a persistent's teardown while references are pending for it.
+FK_API void ForgetPendingReferences(TPersistent* Obj) noexcept;
+} // namespace detail
 
 //===----------------------------------------------------------------------===//
 // TComponent
@@ -88,7 +116,50 @@ struct FK_API IDesignerNotify : IInterface {
   virtual void ValidateRename(TComponent* AComponent, const String& CurName, const String& NewName) = 0;
 };
 
+/// How a component is held through an interface. A component is not counted, so an
+/// interface reference to it must not outlive it: it is handed out only as this wrapper,
+/// which hears of the component's destruction and answers null from then on.
+///
+/// Example:
+///   IPtr<IComponentReference> Ref = ComponentReference(Button);
+///   Button->Destroy();
+///   Ref->GetComponent();   // null, and Ref is still safe to release
+struct FK_API IComponentReference : IInterface {
+  FK_INTERFACE(IComponentReference, IInterface, "{6C1B8E52-3F0A-4D7E-B8C9-2E5F1A7D9043}")
+  /// The component, or null once it is gone.
+  virtual TComponent* GetComponent() = 0;
+};
+
+/// The one reference wrapper of `Component` (made on first request); null for null.
+FK_API IPtr<IComponentReference> ComponentReference(TComponent* Component);
+/// The component behind an interface reference: the wrapper's component, or null for
+/// anything else (a counted object that is not a component).
+FK_API TComponent* ReferencedComponent(const IPtr<IInterface>& Reference);
+
 namespace detail {
+/// A set of components in insertion order with O(1) membership and removal, for the
+/// links of `FreeNotification` (one component may be linked with many thousands).
+/// Removal moves the last element into the gap. Does not own the components.
+class FK_API TComponentLinks {
+public:
+  bool Empty() const noexcept { return FItems.empty(); }
+  size_t Size() const noexcept { return FItems.size(); }
+  /// Adds `C` unless present.
+  void Add(TComponent* C);
+  /// Removes `C` if present; returns whether it was.
+  bool Remove(TComponent* C) noexcept;
+  /// Removes and returns the last component; the set must not be empty.
+  TComponent* PopBack() noexcept;
+  bool Contains(TComponent* C) const noexcept;
+
+private:
+  /// Below this size a scan is cheaper than the index.
+  static constexpr size_t IndexFrom = 16;
+  void BuildIndex();
+  std::vector<TComponent*> FItems;
+  std::unique_ptr<std::unordered_map<TComponent*, size_t>> FIndex; // built past IndexFrom
+};
+
 /// The owned components by name, without regard to case: an open-addressed table of
 /// (hash, component) pairs, so a lookup touches one cache line and the name it finds.
 /// Does not own the components; unnamed components are not held.
@@ -118,9 +189,11 @@ private:
 /// Called for each child in stream order by `GetChildren`.
 using TGetChildProc = std::function<void(TComponent* Child)>;
 
-/// An owned, named component. Not counted: its interface references keep a tally, and
-/// destroying a component that is still referenced reports it through
-/// `DanglingComponentReferenceHook`.
+/// An owned, named component. Not counted: it is held through an interface only by its
+/// `ComponentReference` wrapper. Its own interface references keep a tally; destroying a
+/// component that is still referenced that way reports it through
+/// `DanglingComponentReferenceHook` and keeps its memory until the last such reference
+/// goes, so the late release is safe.
 class FK_API TComponent : public TPersistent, public IInterface {
   FK_CLASS(TComponent, TPersistent)
   FK_INTERFACES(IInterface)
@@ -142,7 +215,8 @@ class FK_API TComponent : public TPersistent, public IInterface {
   void InsertComponent(TComponent* Component);
   /// Removes `Component` from the owned components and notifies.
   void RemoveComponent(TComponent* Component);
-  /// Frees the owned components from the last to the first.
+  /// Frees the owned components from the last to the first. They are not told of each
+  /// other's removal: they all go. Complexity: O(n).
   void DestroyComponents();
 
   // Names -------------------------------------------------------------------
@@ -215,16 +289,22 @@ class FK_API TComponent : public TPersistent, public IInterface {
   String GetNamePath() override;
   TPersistent* GetOwner() override { return FOwner; }
   int ObjAddRef() override { return ++FRefTally; }
-  int ObjRelease() override { return --FRefTally; }
+  /// Drops a tally; the last release of a component destroyed while referenced frees it.
+  int ObjRelease() override;
   int InterfaceTally() const noexcept { return FRefTally; }
 
   void BeforeDestruction() override;
 
 protected:
   void Destroying() override;
+  /// Keeps the memory while the tally is not zero (see `DanglingComponentReferenceHook`).
+  void FreeInstance() override;
   void SetComponentStateFlag(TComponentStateFlag Flag, bool Value) noexcept;
 
 private:
+  friend FK_API void FreeComponentsTogether(const std::vector<TComponent*>& Components);
+  friend FK_API IPtr<IComponentReference> ComponentReference(TComponent* Component);
+  friend class detail::TComponentReference;
   void Insert(TComponent* Component);
   void Remove(TComponent* Component);
   void IndexName(TComponent* Component);
@@ -238,14 +318,29 @@ private:
   int FRefTally = 0;
   TComponentState FComponentState;
   TComponentStyle FComponentStyle{csInheritable};
+  /// Set while owned components leave together: the others need not hear of it.
+  bool FQuietRemovals = false;
+  /// Set once torn down while still referenced: the last release frees the memory.
+  bool FAwaitingRelease = false;
   std::vector<TComponent*> FComponents;
   detail::TNameIndex FNameIndex;
-  std::vector<TComponent*> FFreeNotifies;
+  detail::TComponentLinks FFreeNotifies;
+  /// The wrapper handed out by `ComponentReference`; plain back reference, it owns itself.
+  detail::TComponentReference* FReference = nullptr;
 };
+
+/// Frees components that go away together, in the order given, which must put each
+/// component before its owner. The owner of each is told of its removal, their other
+/// owned components are not: nothing but what `FreeNotification` links (and those are
+/// told) may hold a plain reference to them. Used to drop what a failed read created.
+/// Complexity: O(n) plus the teardowns.
+FK_API void FreeComponentsTogether(const std::vector<TComponent*>& Components);
 
 /// Told when a component is destroyed while interface references to it remain:
 /// (class name, count). The default writes "Instance of Class %s has dangling reference
-/// count of %d" to the standard error stream.
+/// count of %d" to the standard error stream, and in a build made with
+/// `FK_ABORT_ON_DANGLING_REFERENCE` (the test build) aborts: it is a programming error.
+/// Either way the memory stays until the last reference goes, so nothing is corrupted.
 FK_API extern std::function<void(const String& ClassName, int Count)> DanglingComponentReferenceHook;
 
 /// Allocates a component of `Class` and runs its constructor with `Owner`: the class

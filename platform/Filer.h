@@ -166,6 +166,7 @@ protected:
 
 namespace detail {
 struct TReaderState;
+struct TLoadedEntry;
 struct TChildList;
 } // namespace detail
 
@@ -287,7 +288,12 @@ private:
   void CheckLength(std::int64_t Length);
   void EnterNesting();
   void DoFixupReferences();
-  void DropCreatedAfter(std::size_t LoadedIndex);
+  /// Frees what this read created from `LoadedIndex` on, after putting back what it found
+  /// and moved; their pending references go too.
+  void DropCreatedAfter(std::size_t LoadedIndex) noexcept;
+  static void RestoreParent(const detail::TLoadedEntry& Entry) noexcept;
+  /// Drops the pending references into items of `Collection`, which is about to be cleared.
+  void ForgetFixupsInto(TCollection* Collection);
 
   TComponent* FOwner = nullptr;
   TComponent* FParent = nullptr;

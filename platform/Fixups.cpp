@@ -2,9 +2,9 @@
 //
 // A reference to a component of another root is kept as a fixup while that
 // root is not loaded: the holder, the property, the root's name and the path
-// below it. `GlobalFixupReferences` retries them all whenever roots arrive. A
-// hidden watcher component asks to be told when a holder or root goes, so no
-// fixup outlives the object it would write into.
+// below it. `GlobalFixupReferences` retries them all whenever roots arrive.
+// Every object a fixup names counts it and, when it goes, makes the fixups
+// forget it, so no fixup outlives the object it would write into.
 //
 // Example:
 //   BeginGlobalLoading();
@@ -18,12 +18,14 @@
 #include "platform/Lists.h"
 
 #include <algorithm>
+#include <unordered_map>
+#include <unordered_set>
 
 namespace formkit {
 
 namespace detail {
 
-/// Hears of the destruction of the components that fixups and loading lists name.
+/// Hears of the destruction of the roots that loading lists name.
 class TFixupWatcher : public TComponent {
   FK_CLASS(TFixupWatcher, TComponent)
   void Notification(TComponent* AComponent, TOperation Operation) override;
@@ -33,6 +35,8 @@ class TFixupWatcher : public TComponent {
 
 namespace {
 
+/// A reference into a root that is not loaded yet: written into `Prop` of `Instance`
+/// (which `Holder` holds, in module `Root`) once `RootName` is found.
 struct TGlobalFixup {
   TComponent* Root;
   TPersistent* Instance;
@@ -40,10 +44,92 @@ struct TGlobalFixup {
   PPropInfo Prop;
   String RootName;
   String Path;
+  bool Alive = true;
 };
 
+/// The pending global fix-ups. Every object a fix-up names (module, holder, the object
+/// written into) counts it, and its teardown makes the fix-ups forget it, so no fix-up
+/// outlives what it would write into. Forgotten fix-ups are dropped in bulk, so that
+/// adding and forgetting are O(1) amortised.
+class TGlobalFixups {
+public:
+  /// Adds a fix-up; `Instance`, `Holder` and `Root` count it.
+  void Add(TGlobalFixup F);
+  /// Forgets the fix-up at `Index`.
+  void Kill(std::size_t Index) noexcept;
+  /// Forgets every fix-up that names `Obj`. Complexity: O(fix-ups naming it).
+  void ForgetObject(TPersistent* Obj) noexcept;
+  /// Forgets the fix-ups for which `Pred` holds.
+  template <class P> void KillIf(P Pred) noexcept {
+    for (std::size_t I = 0; I < FList.size(); ++I)
+      if (FList[I].Alive && Pred(FList[I])) Kill(I);
+  }
+  /// The live fix-ups and dead slots, by index; dead ones have `Alive` false.
+  std::size_t Size() const noexcept { return FList.size(); }
+  const TGlobalFixup& At(std::size_t Index) const noexcept { return FList[Index]; }
+  TGlobalFixup& At(std::size_t Index) noexcept { return FList[Index]; }
+  /// Drops the dead slots once they are the majority; indices change, so only between walks.
+  void Compact();
+
+private:
+  template <class F> static void ForEachObject(const TGlobalFixup& Fx, F Fn) {
+    Fn(Fx.Root);
+    if (Fx.Holder != Fx.Root) Fn(Fx.Holder);
+    if (Fx.Instance != Fx.Root && Fx.Instance != Fx.Holder) Fn(Fx.Instance);
+  }
+  std::vector<TGlobalFixup> FList;
+  std::size_t FDead = 0;
+  /// For each object a live fix-up names, the indices of fix-ups naming it (some dead).
+  std::unordered_map<TPersistent*, std::vector<std::size_t>> FByObject;
+};
+
+void TGlobalFixups::Add(TGlobalFixup F) {
+  std::size_t Index = FList.size();
+  FList.push_back(std::move(F));
+  ForEachObject(FList.back(), [&](TPersistent* Obj) {
+    if (!Obj) return;
+    FByObject[Obj].push_back(Index);
+    detail::TPendingReferenceCount::Add(Obj);
+  });
+}
+
+void TGlobalFixups::Kill(std::size_t Index) noexcept {
+  TGlobalFixup& F = FList[Index];
+  if (!F.Alive) return;
+  F.Alive = false;
+  ++FDead;
+  ForEachObject(F, [&](TPersistent* Obj) {
+    if (!Obj) return;
+    detail::TPendingReferenceCount::Drop(Obj);
+    if (detail::TPendingReferenceCount::Of(Obj) == 0) FByObject.erase(Obj);
+  });
+}
+
+void TGlobalFixups::ForgetObject(TPersistent* Obj) noexcept {
+  auto It = FByObject.find(Obj);
+  if (It == FByObject.end()) return;
+  std::vector<std::size_t> Indices = std::move(It->second);
+  for (std::size_t I : Indices) Kill(I);
+  FByObject.erase(Obj);
+}
+
+void TGlobalFixups::Compact() {
+  if (FDead * 2 <= FList.size()) return;
+  std::vector<TGlobalFixup> Live;
+  Live.reserve(FList.size() - FDead);
+  for (TGlobalFixup& F : FList)
+    if (F.Alive) Live.push_back(std::move(F));
+  FList = std::move(Live);
+  FDead = 0;
+  FByObject.clear();
+  for (std::size_t I = 0; I < FList.size(); ++I)
+    ForEachObject(FList[I], [&](TPersistent* Obj) {
+      if (Obj) FByObject[Obj].push_back(I);
+    });
+}
+
 struct TFixupState {
-  std::vector<TGlobalFixup> Fixups;
+  TGlobalFixups Fixups;
   std::vector<std::vector<TComponent*>> Loading;
   std::vector<std::pair<int, TFindGlobalComponent>> Finders;
   int NextToken = 1;
@@ -76,27 +162,24 @@ FK_IMPLEMENT(TFixupWatcher, "Classes") {}
 void TFixupWatcher::Notification(TComponent* AComponent, TOperation Operation) {
   inherited::Notification(AComponent, Operation);
   if (Operation != opRemove) return;
-  TFixupState& S = State();
-  std::erase_if(S.Fixups, [&](const TGlobalFixup& F) { return F.Root == AComponent || F.Holder == AComponent; });
-  for (auto& List : S.Loading) std::erase_if(List, [&](TComponent* C) { return IsOwnedBy(C, AComponent); });
+  for (auto& List : State().Loading) std::erase_if(List, [&](TComponent* C) { return IsOwnedBy(C, AComponent); });
 }
+
+void ForgetPendingReferences(TPersistent* Obj) noexcept { State().Fixups.ForgetObject(Obj); }
 
 void AddGlobalFixup(TComponent* Root, TPersistent* Instance, TComponent* Holder, PPropInfo Prop, const String& Path) {
   std::size_t Dot = Path.find('.');
   String RootName = Path.substr(0, Dot);
   String Rest = Dot == String::npos ? String() : Path.substr(Dot + 1);
-  Watch(Root);
-  Watch(Holder);
-  State().Fixups.push_back({Root, Instance, Holder, Prop, std::move(RootName), std::move(Rest)});
+  TGlobalFixups& Fixups = State().Fixups;
+  Fixups.Compact();
+  Fixups.Add({Root, Instance, Holder, Prop, std::move(RootName), std::move(Rest)});
 }
 
 void SetReferenceProp(TPersistent* Instance, PPropInfo Prop, TComponent* Target) {
-  if (Prop->Kind() == tkInterface) {
-    IPtr<IInterface> I(Target ? static_cast<IInterface*>(Target) : nullptr);
-    SetInterfaceProp(Instance, Prop, I);
-  } else {
-    SetObjectProp(Instance, Prop, Target);
-  }
+  // A component is held through an interface only by its reference wrapper.
+  if (Prop->Kind() == tkInterface) SetInterfaceProp(Instance, Prop, IPtr<IInterface>(ComponentReference(Target)));
+  else SetObjectProp(Instance, Prop, Target);
 }
 
 TComponent* FindReference(TComponent* LookupRoot, const String& Path) {
@@ -116,10 +199,8 @@ bool AddGlobalLoaded(const std::vector<TComponent*>& Components) {
 }
 
 void RemoveGlobalLoaded(const std::vector<TComponent*>& Components) {
-  for (auto& List : State().Loading)
-    std::erase_if(List, [&](TComponent* C) {
-      return std::find(Components.begin(), Components.end(), C) != Components.end();
-    });
+  std::unordered_set<TComponent*> Gone(Components.begin(), Components.end());
+  for (auto& List : State().Loading) std::erase_if(List, [&](TComponent* C) { return Gone.count(C) != 0; });
 }
 
 } // namespace detail
@@ -174,39 +255,52 @@ TComponent* FindGlobalComponent(const String& Name) {
 //===----------------------------------------------------------------------===//
 
 void GlobalFixupReferences() {
-  TFixupState& S = State();
-  for (std::size_t I = 0; I < S.Fixups.size();) {
-    const TGlobalFixup& F = S.Fixups[I];
-    TComponent* Root = FindGlobalComponent(F.RootName);
-    TComponent* Target = Root ? (F.Path.empty() ? Root : FindNestedComponent(Root, F.Path)) : nullptr;
-    if (!Target) {
-      ++I;
-      continue;
-    }
-    TGlobalFixup Done = F;
-    S.Fixups.erase(S.Fixups.begin() + static_cast<std::ptrdiff_t>(I));
+  TGlobalFixups& Fixups = State().Fixups;
+  Fixups.Compact();
+  // A finder or a setter may add fix-ups (the list grows) or free objects (fix-ups die):
+  // walk by index, and copy what is needed before calling out.
+  for (std::size_t I = 0; I < Fixups.Size(); ++I) {
+    if (!Fixups.At(I).Alive) continue;
+    String RootName = Fixups.At(I).RootName;
+    TComponent* Root = FindGlobalComponent(RootName);
+    if (!Root || !Fixups.At(I).Alive) continue;
+    const TGlobalFixup& F = Fixups.At(I);
+    TComponent* Target = F.Path.empty() ? Root : FindNestedComponent(Root, F.Path);
+    if (!Target) continue;
+    TPersistent* Instance = F.Instance;
+    PPropInfo Prop = F.Prop;
+    Fixups.Kill(I);
     try {
-      detail::SetReferenceProp(Done.Instance, Done.Prop, Target);
+      detail::SetReferenceProp(Instance, Prop, Target);
     } catch (const Exception&) {
       // A target of the wrong class cannot be assigned; the reference is dropped.
     }
   }
 }
 
+namespace {
+/// Calls `Fn` for each live fix-up.
+template <class F> void ForEachFixup(F Fn) {
+  TGlobalFixups& Fixups = State().Fixups;
+  for (std::size_t I = 0; I < Fixups.Size(); ++I)
+    if (Fixups.At(I).Alive) Fn(Fixups.At(I));
+}
+} // namespace
+
 void GetFixupReferenceNames(TComponent* Root, std::vector<String>& Names) {
-  for (const TGlobalFixup& F : State().Fixups) {
-    if (F.Root != Root) continue;
+  ForEachFixup([&](const TGlobalFixup& F) {
+    if (F.Root != Root) return;
     bool Known = std::any_of(Names.begin(), Names.end(), [&](const String& N) { return SameText(N, F.RootName); });
     if (!Known) Names.push_back(F.RootName);
-  }
+  });
 }
 
 void GetFixupInstanceNames(TComponent* Root, const String& ReferenceRootName, std::vector<String>& Names) {
-  for (const TGlobalFixup& F : State().Fixups) {
-    if (F.Root != Root || !SameText(F.RootName, ReferenceRootName) || F.Path.empty()) continue;
+  ForEachFixup([&](const TGlobalFixup& F) {
+    if (F.Root != Root || !SameText(F.RootName, ReferenceRootName) || F.Path.empty()) return;
     bool Known = std::any_of(Names.begin(), Names.end(), [&](const String& N) { return SameText(N, F.Path); });
     if (!Known) Names.push_back(F.Path);
-  }
+  });
 }
 
 namespace {
@@ -229,13 +323,16 @@ void GetFixupInstanceNames(TComponent* Root, const String& ReferenceRootName, TS
 }
 
 void RedirectFixupReferences(TComponent* Root, const String& OldRootName, const String& NewRootName) {
-  for (TGlobalFixup& F : State().Fixups)
-    if (F.Root == Root && SameText(F.RootName, OldRootName)) F.RootName = NewRootName;
+  TGlobalFixups& Fixups = State().Fixups;
+  for (std::size_t I = 0; I < Fixups.Size(); ++I) {
+    TGlobalFixup& F = Fixups.At(I);
+    if (F.Alive && F.Root == Root && SameText(F.RootName, OldRootName)) F.RootName = NewRootName;
+  }
   GlobalFixupReferences();
 }
 
 void RemoveFixupReferences(TComponent* Root, const String& RootName) {
-  std::erase_if(State().Fixups, [&](const TGlobalFixup& F) {
+  State().Fixups.KillIf([&](const TGlobalFixup& F) {
     return (!Root || F.Root == Root) && (RootName.empty() || SameText(F.RootName, RootName));
   });
 }

@@ -44,6 +44,32 @@ void TClassRec::FinishProperties() {
   FSorted = FProps;
   std::stable_sort(FSorted.begin(), FSorted.end(),
                    [](PPropInfo A, PPropInfo B) { return CompareText(A->Name, B->Name) < 0; });
+  IndexPropertiesByName();
+}
+
+namespace {
+/// FNV-1a over the name folded to ASCII upper case, so that it agrees with `SameText`.
+std::uint64_t FoldedNameHash(std::string_view Name) noexcept {
+  std::uint64_t H = 14695981039346656037ull;
+  for (char C : Name) {
+    unsigned char U = static_cast<unsigned char>(C);
+    if (U >= 'a' && U <= 'z') U -= 32;
+    H = (H ^ U) * 1099511628211ull;
+  }
+  return H;
+}
+} // namespace
+
+void TClassRec::IndexPropertiesByName() {
+  std::size_t Size = 8;
+  while (Size < FProps.size() * 2) Size *= 2;
+  FByName.assign(Size, {0, nullptr});
+  for (PPropInfo P : FProps) {
+    std::uint64_t H = FoldedNameHash(P->Name);
+    std::size_t I = H & (Size - 1);
+    while (FByName[I].second) I = (I + 1) & (Size - 1);
+    FByName[I] = {H, P};
+  }
 }
 
 bool TClassRec::InheritsFrom(const TClassRec* Other) const noexcept {
@@ -77,9 +103,12 @@ String TClassRec::MethodName(const void* Code) const {
 }
 
 PPropInfo TClassRec::FindProperty(std::string_view Name) const noexcept {
-  auto It = std::lower_bound(FSorted.begin(), FSorted.end(), Name,
-                             [](PPropInfo P, std::string_view N) { return CompareText(P->Name, N) < 0; });
-  return (It != FSorted.end() && SameText((*It)->Name, Name)) ? *It : nullptr;
+  if (FByName.empty()) return nullptr;
+  std::uint64_t H = FoldedNameHash(Name);
+  std::size_t Mask = FByName.size() - 1;
+  for (std::size_t I = H & Mask; FByName[I].second; I = (I + 1) & Mask)
+    if (FByName[I].first == H && SameText(FByName[I].second->Name, Name)) return FByName[I].second;
+  return nullptr;
 }
 
 TObject* TClassRec::NewInstance() {
@@ -97,6 +126,7 @@ TClass TClassRec::NewGeneratedClass(TClass AParent, String AClassName, String AU
   Rec->Factory = AParent->Factory;
   Rec->FProps = AParent->FProps;
   Rec->FSorted = AParent->FSorted;
+  Rec->FByName = AParent->FByName;
   return Rec;
 }
 
@@ -144,7 +174,7 @@ void TObject::Destroy() {
   }
   Destroying();
   BeforeDestruction();
-  delete this;
+  FreeInstance();
 }
 
 void* TObject::GetInterfaceEntry(const TGUID&) { return nullptr; }

@@ -102,7 +102,8 @@ public:
   void* MethodAddress(std::string_view Name) const noexcept;
   /// The name of the published method with that code, or empty.
   String MethodName(const void* Code) const;
-  /// The property of that name (without regard to case), or null. Complexity: O(log n).
+  /// The property of that name (without regard to case), or null. Complexity: O(1): a
+  /// hash of the folded name, then one comparison with the candidate.
   PPropInfo FindProperty(std::string_view Name) const noexcept;
   /// Allocates an instance without running any constructor logic; the instance's
   /// record is this one. Raises `EInvalidOperation` for an abstract class.
@@ -125,6 +126,9 @@ private:
   std::vector<TPropInfo*> FOwnProps; // owned
   std::vector<PPropInfo> FProps;
   std::vector<PPropInfo> FSorted;
+  /// `FProps` by folded-name hash: open addressing, a power of two in size, empty slots null.
+  std::vector<std::pair<std::uint64_t, PPropInfo>> FByName;
+  void IndexPropertiesByName();
 };
 
 //===----------------------------------------------------------------------===//
@@ -207,7 +211,7 @@ public:
   void* MethodAddress(std::string_view Name) const { return ClassType()->MethodAddress(Name); }
 
   /// Destroys the instance: the record's destruction hook, `Destroying`,
-  /// `BeforeDestruction` (the teardown), then the memory. Null-safe via `FreeAndNil`.
+  /// `BeforeDestruction` (the teardown), then `FreeInstance`. Null-safe via `FreeAndNil`.
   void Destroy();
   /// Teardown. Overrides undo their own work and call `inherited::BeforeDestruction` last.
   virtual void BeforeDestruction() {}
@@ -227,6 +231,9 @@ protected:
   virtual ~TObject();
   /// Announces destruction before any teardown runs (components set `Destroying`).
   virtual void Destroying() {}
+  /// Gives the memory back once the teardown is done. A class whose instances may still
+  /// be referenced from outside after their teardown overrides it to free later.
+  virtual void FreeInstance() { delete this; }
 
 private:
   friend class TClassRec;

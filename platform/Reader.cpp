@@ -10,6 +10,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <unordered_set>
 
 namespace formkit {
 
@@ -34,7 +35,12 @@ namespace detail {
 
 struct TLoadedEntry {
   TComponent* Component;
+  /// Made by this read (dropped when it fails), or found (an inherited component).
   bool Created;
+  /// Whether the read moved a found component, and the parent it had before: restored
+  /// when the read fails.
+  bool Moved = false;
+  TComponent* OldParent = nullptr;
 };
 
 struct TFixup {
@@ -562,21 +568,38 @@ void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
 void TReader::ReadCollection(TCollection* Collection) {
   TNestingGuard G(FNesting);
   Collection->BeginUpdate();
-  try {
-    Collection->Clear();
-    while (!EndOfList()) {
-      if (IsIntTag(NextValue())) ReadInt64();
-      ReadListBegin();
-      TCollectionItem* Item = Collection->Add();
-      while (!EndOfList()) ReadProperty(Item);
-      ReadListEnd();
-    }
+  auto End = Finally([&]() noexcept { Collection->EndUpdate(); });
+  // The items go: references read into them earlier (the property came twice) must not
+  // be written into freed items.
+  if (Collection->Count() > 0) ForgetFixupsInto(Collection);
+  Collection->Clear();
+  while (!EndOfList()) {
+    if (IsIntTag(NextValue())) ReadInt64();
+    ReadListBegin();
+    TCollectionItem* Item = Collection->Add();
+    while (!EndOfList()) ReadProperty(Item);
     ReadListEnd();
-  } catch (...) {
-    Collection->EndUpdate();
-    throw;
   }
-  Collection->EndUpdate();
+  ReadListEnd();
+}
+
+namespace {
+bool IsWithin(TPersistent* Obj, const TPersistent* Container) {
+  for (TPersistent* P = Obj; P; P = P->GetOwner())
+    if (P == Container) return true;
+  return false;
+}
+} // namespace
+
+void TReader::ForgetFixupsInto(TCollection* Collection) {
+  if (!FState) return;
+  // The current component's references were read last: they are the tail of the list.
+  auto& Fixups = FState->Fixups;
+  std::size_t First = Fixups.size();
+  while (First > 0 && Fixups[First - 1].Holder == FCurrent) --First;
+  auto Gone = std::remove_if(Fixups.begin() + static_cast<std::ptrdiff_t>(First), Fixups.end(),
+                             [&](const detail::TFixup& F) { return IsWithin(F.Instance, Collection); });
+  Fixups.erase(Gone, Fixups.end());
 }
 
 void TReader::DefineProperty(const String& Name, const TReaderProc& ReadData, const TWriterProc&, bool) {
@@ -648,26 +671,43 @@ void TReader::FixupReferences() {
   }
 }
 
-void TReader::DropCreatedAfter(std::size_t LoadedIndex) {
+void TReader::DropCreatedAfter(std::size_t LoadedIndex) noexcept {
   if (!FState || LoadedIndex >= FState->Loaded.size()) return;
   auto& Loaded = FState->Loaded;
+  // What the read found and moved goes back where it was first, latest move first, so
+  // that dropping a new container never takes a component it did not create with it.
   std::vector<TComponent*> Gone;
   for (std::size_t I = Loaded.size(); I-- > LoadedIndex;) {
-    if (Loaded[I].Created) Gone.push_back(Loaded[I].Component);
-    else {
-      Loaded[I].Component->SetReading(false);
-      Loaded[I].Component->SetLoading(false);
+    const detail::TLoadedEntry& E = Loaded[I];
+    if (E.Created) {
+      Gone.push_back(E.Component);
+      continue;
     }
+    E.Component->SetReading(false);
+    E.Component->SetLoading(false);
+    RestoreParent(E);
   }
   Loaded.resize(LoadedIndex);
-  auto& Fixups = FState->Fixups;
-  Fixups.erase(std::remove_if(Fixups.begin(), Fixups.end(),
-                              [&](const detail::TFixup& F) {
-                                return std::find(Gone.begin(), Gone.end(), F.Holder) != Gone.end();
-                              }),
-               Fixups.end());
-  // Last created first: children before their parents, as owners free them.
-  for (TComponent* C : Gone) C->Destroy();
+  std::unordered_set<TComponent*> GoneSet(Gone.begin(), Gone.end());
+  std::erase_if(FState->Fixups, [&](const detail::TFixup& F) { return GoneSet.count(F.Holder) != 0; });
+  // Last created first: children before their parents and owners.
+  FreeComponentsTogether(Gone);
+}
+
+void TReader::RestoreParent(const detail::TLoadedEntry& E) noexcept {
+  TComponent* C = E.Component;
+  if (!E.Moved || C->GetParentComponent() == E.OldParent) return;
+  try {
+    C->SetParentComponent(E.OldParent);
+  } catch (...) {
+    // The component had that parent before the read: taking it back cannot be refused.
+    // Should a framework refuse anyway, leave it without one rather than with a parent
+    // that is about to go.
+    try {
+      C->SetParentComponent(nullptr);
+    } catch (...) {
+    }
+  }
 }
 
 void TReader::ReadData(TComponent* Instance) {
@@ -753,8 +793,12 @@ TComponent* TReader::ReadComponent(TComponent* Component) {
     }
     Result->SetLoading(true);
     Result->SetReading(true);
-    if (FParent && Result != FParent && Result->HasParent() && Result->GetParentComponent() != FParent)
+    if (FParent && Result != FParent && Result->HasParent() && Result->GetParentComponent() != FParent) {
+      detail::TLoadedEntry& Entry = FState->Loaded[LoadedIndex];
+      Entry.Moved = !Entry.Created;
+      Entry.OldParent = Result->GetParentComponent();
       Result->SetParentComponent(FParent);
+    }
     Result->ReadState(this);
     Result->SetReading(false);
     if (Flags.Contains(ffChildPos) && FParent) FParent->SetChildOrder(Result, ChildPos);

@@ -11,6 +11,8 @@
 //===----------------------------------------------------------------------===//
 #pragma once
 
+#include "platform/ScopeGuard.h"
+
 #include <cstdint>
 #include <exception>
 #include <initializer_list>

@@ -80,9 +80,8 @@ String ComparePath(TComponent* C, TComponent* LookupRoot, const TCompareContext&
   return ReferencePath(C, LookupRoot);
 }
 
-TComponent* ComponentOfInterface(const IPtr<IInterface>& I) {
-  return I ? dynamic_cast<TComponent*>(I.Get()) : nullptr;
-}
+/// Components are held through interfaces only by their reference wrappers.
+TComponent* ComponentOfInterface(const IPtr<IInterface>& I) { return ReferencedComponent(I); }
 
 String MethodNameOf(const TMethod& M) {
   if (!M.Code || !M.Data) return "";

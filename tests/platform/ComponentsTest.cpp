@@ -268,6 +268,7 @@ TEST(Ownership, ADestroyedComponentStillReferencedIsReported) {
   DanglingComponentReferenceHook = Saved;
   ASSERT_EQ(Reports.size(), 1u);
   EXPECT_EQ(Reports[0], (std::pair<String, int>{"TSampleWidget", 1}));
+  Held->Release(); // the last reference frees what the teardown kept
 }
 
 TEST(Names, FindComponentAgreesWithAReferenceThroughRenamesAndRemovals) {

@@ -86,7 +86,7 @@ TEST(Fixups, ACrossRootReferenceWaitsForItsRoot) {
   // Loading the root resolves what points into it; the list shrinks.
   TComponent* Data = Roots.Open("object Data: TOtherForm\n  object Source1: TTicker\n  end\nend\n");
   EXPECT_EQ(Data->FindComponent("Source1"), B1->Buddy);
-  EXPECT_EQ(static_cast<IInterface*>(Data), B1->Peer.Get());
+  EXPECT_EQ(Data, ReferencedComponent(B1->Peer));
   EXPECT_EQ((std::vector<String>{"Extra"}), ReferenceNames(Main));
 
   // A redirect to a root that exists resolves; the list ends empty.

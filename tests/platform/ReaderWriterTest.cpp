@@ -80,7 +80,7 @@ TEST(ReaderWriter, RichTreeRoundTripsThroughBinary) {
   EXPECT_TRUE(B1->Value.IsNull());
   EXPECT_EQ(B2, B1->Buddy) << "a forward reference is fixed up";
   EXPECT_EQ(TVariant("text"), B2->Value);
-  EXPECT_EQ(static_cast<IInterface*>(Panel), B2->Peer.Get());
+  EXPECT_EQ(Panel, ReferencedComponent(B2->Peer));
   ASSERT_TRUE(B1->OnPoke.IsAssigned());
   EXPECT_EQ(static_cast<TObject*>(F), static_cast<TObject*>(B1->OnPoke.Method().Data));
   B1->OnPoke(B1);

@@ -171,7 +171,7 @@ TTestForm* BuildRichForm() {
   TTestControl* B2 = AddControl(Form, Panel, "Button2");
   B2->Value = TVariant("text");
   B1->Buddy = B2; // a reference to a component read later
-  B2->Peer = IPtr<IInterface>(static_cast<IInterface*>(Panel));
+  B2->Peer = ComponentReference(Panel);
   auto* Ticker = static_cast<TTicker*>(CreateComponent(TTicker::StaticClass(), Form));
   Ticker->SetName("Ticker1");
   Ticker->Interval = 250;

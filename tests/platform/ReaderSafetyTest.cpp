@@ -1,0 +1,156 @@
+//===- tests/platform/ReaderSafetyTest.cpp - What a read may free --------===//
+//
+// Reads whose pending references would write into objects that are gone by
+// the time they resolve, failed reads that must free exactly what they made,
+// and interface references to components that outlive them.
+//
+//===----------------------------------------------------------------------===//
+#include "tests/platform/StreamingFixtures.h"
+
+#include <gtest/gtest.h>
+
+#include <map>
+
+using namespace formkit;
+using namespace formkit::streamtest;
+
+namespace {
+
+TTestControl* Ctl(TComponent* Root, const char* Name) { return static_cast<TTestControl*>(Root->FindComponent(Name)); }
+
+/// Finds open roots by name for the global fix-ups.
+class TRootFinder {
+public:
+  TRootFinder() {
+    FToken = RegisterFindGlobalComponentProc([this](const String& Name) -> TComponent* {
+      auto It = Roots.find(UpperCase(Name));
+      return It == Roots.end() ? nullptr : It->second;
+    });
+  }
+  ~TRootFinder() { UnregisterFindGlobalComponentProc(FToken); }
+  TRootFinder(const TRootFinder&) = delete;
+  TRootFinder& operator=(const TRootFinder&) = delete;
+  std::map<String, TComponent*> Roots;
+
+private:
+  int FToken;
+};
+
+} // namespace
+
+TEST(ReaderSafety, AReferenceIntoACollectionReadTwiceIsDroppedWithItsItem) {
+  // The first Rows holds an item with a pending reference; the second Rows clears the
+  // collection and frees that item before references resolve.
+  TObjectGuard<TComponent> Root(ReadBytes(TextToBinary("object Form1: TTestForm\n"
+                                                       "  object Button1: TTestControl\n"
+                                                       "    Rows = <\n"
+                                                       "      item\n"
+                                                       "        Link = Button2\n"
+                                                       "      end\n"
+                                                       "    >\n"
+                                                       "    Rows = <\n"
+                                                       "      item\n"
+                                                       "        Caption = \"second\"\n"
+                                                       "      end\n"
+                                                       "    >\n"
+                                                       "  end\n"
+                                                       "  object Button2: TTestControl\n"
+                                                       "  end\n"
+                                                       "end\n")));
+  TOwnedCollection* Rows = Ctl(Root.Get(), "Button1")->Rows;
+  ASSERT_EQ(1, Rows->Count());
+  auto* Row = static_cast<TRow*>(Rows->Items(0));
+  EXPECT_EQ("second", Row->Caption);
+  EXPECT_EQ(nullptr, Row->Link);
+}
+
+TEST(ReaderSafety, AGlobalReferenceDiesWithTheItemThatHeldIt) {
+  TRootFinder Finder;
+  TObjectGuard<TComponent> Main(ReadBytes(TextToBinary("object Main: TTestForm\n"
+                                                       "  object Button1: TTestControl\n"
+                                                       "    Rows = <\n"
+                                                       "      item\n"
+                                                       "        Link = Data.Source1\n"
+                                                       "      end\n"
+                                                       "      item\n"
+                                                       "        Link = Data.Source1\n"
+                                                       "      end\n"
+                                                       "    >\n"
+                                                       "  end\n"
+                                                       "end\n")));
+  std::vector<String> Names;
+  GetFixupReferenceNames(Main.Get(), Names);
+  EXPECT_EQ(std::vector<String>{"Data"}, Names);
+  // The first item goes while Data is not open; opening Data later resolves only the other.
+  TOwnedCollection* Rows = Ctl(Main.Get(), "Button1")->Rows;
+  Rows->Delete(0);
+  TObjectGuard<TComponent> Data(ReadBytes(TextToBinary("object Data: TOtherForm\n"
+                                                       "  object Source1: TTicker\n"
+                                                       "  end\n"
+                                                       "end\n")));
+  Finder.Roots["DATA"] = Data.Get();
+  GlobalFixupReferences();
+  ASSERT_EQ(1, Rows->Count());
+  EXPECT_EQ(Data->FindComponent("Source1"), static_cast<TRow*>(Rows->Items(0))->Link);
+  Names.clear();
+  GetFixupReferenceNames(Main.Get(), Names);
+  EXPECT_TRUE(Names.empty());
+}
+
+TEST(ReaderSafety, ManyPendingGlobalReferencesFreeWithTheirHolders) {
+  // Holders freed one by one, then the module: every fix-up is forgotten exactly once.
+  TRootFinder Finder;
+  String Text = "object Main: TTestForm\n";
+  for (int I = 0; I < 300; ++I)
+    Text += "  object B" + std::to_string(I) + ": TTestControl\n    Buddy = Far.Thing" + std::to_string(I) + "\n  end\n";
+  Text += "end\n";
+  TComponent* Main = ReadBytes(TextToBinary(Text));
+  for (int I = 0; I < 300; I += 2) Main->FindComponent("B" + std::to_string(I))->Destroy();
+  std::vector<String> Instances;
+  GetFixupInstanceNames(Main, "Far", Instances);
+  EXPECT_EQ(150u, Instances.size());
+  EXPECT_EQ("Thing1", Instances.front());
+  Main->Destroy();
+  TObjectGuard<TComponent> Far(ReadBytes(TextToBinary("object Far: TOtherForm\n  object Thing1: TTicker\n  end\nend\n")));
+  Finder.Roots["FAR"] = Far.Get();
+  GlobalFixupReferences(); // nothing left that could write into the freed module
+  std::vector<String> Names;
+  GetFixupReferenceNames(Main, Names);
+  EXPECT_TRUE(Names.empty());
+}
+
+//===----------------------------------------------------------------------===//
+// Interface references to components
+//===----------------------------------------------------------------------===//
+
+TEST(ComponentReferences, AWrapperOutlivesItsComponentSafely) {
+  TObjectGuard<TComponent> Owner(CreateComponent(TComponent::StaticClass(), nullptr));
+  auto* Holder = static_cast<TTestControl*>(CreateComponent(TTestControl::StaticClass(), Owner.Get()));
+  TComponent* Target = CreateComponent(TTicker::StaticClass(), Owner.Get());
+  Holder->Peer = ComponentReference(Target);
+  EXPECT_EQ(Target, ReferencedComponent(Holder->Peer));
+  // One wrapper a component: asking twice gives the same one.
+  EXPECT_EQ(ComponentReference(Target).Get(), QueryAs<IComponentReference>(Holder->Peer).Get());
+  EXPECT_EQ(0, Target->InterfaceTally());
+  Target->Destroy();
+  EXPECT_EQ(nullptr, ReferencedComponent(Holder->Peer));
+  EXPECT_EQ(nullptr, ComponentReference(nullptr));
+  // A counted object that is not a wrapper names no component.
+  EXPECT_EQ(nullptr, ReferencedComponent(IPtr<IInterface>(New<TInterfacedObject>())));
+}
+
+TEST(ComponentReferences, APlainReferenceThatOutlivesItsComponentIsReportedAndSafe) {
+  std::vector<std::pair<String, int>> Reports;
+  auto Saved = DanglingComponentReferenceHook;
+  DanglingComponentReferenceHook = [&](const String& Name, int Count) { Reports.emplace_back(Name, Count); };
+  auto* C = CreateComponent(TTicker::StaticClass(), nullptr);
+  IPtr<IInterface> Held(static_cast<IInterface*>(C));
+  IPtr<IInterface> Second = Held;
+  C->Destroy();
+  DanglingComponentReferenceHook = Saved;
+  ASSERT_EQ(1u, Reports.size());
+  EXPECT_EQ((std::pair<String, int>{"TTicker", 2}), Reports[0]);
+  // The memory stays until the last plain reference goes: the releases are safe.
+  Held = nullptr;
+  Second = nullptr;
+}
