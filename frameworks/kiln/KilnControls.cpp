@@ -265,8 +265,11 @@ void TControl::SetName(const String& NewName) {
 FK_IMPLEMENT(TWinControl, "KilnControls") {}
 
 void TWinControl::BeforeDestruction() {
-  // A windowed control takes its children with it, whoever owns them; each leaves its
-  // owner in its own teardown.
+  // What this control owns goes first, in one pass from the last to the first: usually
+  // that is all of its children, each found at the back of its parent's list. Then it
+  // takes the remaining children with it, whoever owns them; each leaves its owner in
+  // its own teardown.
+  DestroyComponents();
   while (!FControls.empty()) FControls.back()->Destroy();
   inherited::BeforeDestruction();
 }
@@ -292,24 +295,50 @@ void TWinControl::RemoveControl(TControl* AControl) {
   AControl->SetParent(nullptr);
 }
 
+void TWinControl::ReserveForChild(bool Windowed) {
+  // Geometric growth: reserving one more slot at a time would copy the list per child.
+  auto Grow = [](auto& List) {
+    if (List.size() == List.capacity()) List.reserve(std::max<std::size_t>(8, List.capacity() * 2));
+  };
+  Grow(FControls);
+  if (Windowed) Grow(FTabList);
+}
+
 void TWinControl::Attach(TControl* Child) {
-  FControls.reserve(FControls.size() + 1);
   auto* W = dynamic_cast<TWinControl*>(Child);
-  if (W) FTabList.reserve(FTabList.size() + 1);
+  ReserveForChild(W != nullptr);
   // Nothing below allocates: the lists stay consistent.
   FControls.push_back(Child);
   Child->FParent = this;
   if (!W) return;
   FTabList.push_back(W);
+  W->FTabIndex = static_cast<int>(FTabList.size()) - 1;
   if (W->FPendingTabOrder >= 0) {
     int Pending = std::exchange(W->FPendingTabOrder, -1);
     W->SetTabOrder(Pending);
   }
 }
 
+namespace {
+/// Erases `Item` from `List`, searching from the back, where teardown finds it; returns
+/// whether it was the last element.
+template <class T> bool EraseFromBack(std::vector<T*>& List, const void* Item) noexcept {
+  for (std::size_t I = List.size(); I-- > 0;)
+    if (List[I] == Item) {
+      bool Last = I + 1 == List.size();
+      List.erase(List.begin() + static_cast<std::ptrdiff_t>(I));
+      return Last;
+    }
+  return true;
+}
+} // namespace
+
 void TWinControl::Detach(TControl* Child) noexcept {
-  std::erase(FControls, Child);
-  if (auto* W = dynamic_cast<TWinControl*>(Child)) std::erase(FTabList, W);
+  EraseFromBack(FControls, Child);
+  if (auto* W = dynamic_cast<TWinControl*>(Child)) {
+    if (!EraseFromBack(FTabList, W)) FTabListStale = true;
+    W->FTabIndex = -1;
+  }
   Child->FParent = nullptr;
 }
 
@@ -345,9 +374,13 @@ void TWinControl::SetChildZOrder(TControl* Child, int Position) {
 
 int TWinControl::TabOrder() const noexcept {
   if (!FParent) return -1;
-  const auto& L = FParent->FTabList;
-  auto It = std::find(L.begin(), L.end(), this);
-  return It == L.end() ? -1 : static_cast<int>(It - L.begin());
+  if (FParent->FTabListStale) FParent->RenumberTabList();
+  return FTabIndex;
+}
+
+void TWinControl::RenumberTabList() const noexcept {
+  for (std::size_t I = 0; I < FTabList.size(); ++I) FTabList[I]->FTabIndex = static_cast<int>(I);
+  FTabListStale = false;
 }
 
 void TWinControl::SetTabOrder(int Value) {
@@ -355,12 +388,14 @@ void TWinControl::SetTabOrder(int Value) {
     FPendingTabOrder = Value;
     return;
   }
+  int Current = TabOrder();
+  if (Current < 0) return;
   auto& L = FParent->FTabList;
-  auto It = std::find(L.begin(), L.end(), this);
-  if (It == L.end()) return;
-  L.erase(It);
-  Value = std::clamp(Value, 0, static_cast<int>(L.size()));
+  Value = std::clamp(Value, 0, static_cast<int>(L.size()) - 1);
+  if (Value == Current) return;
+  L.erase(L.begin() + Current);
   L.insert(L.begin() + Value, this);
+  FParent->FTabListStale = true;
 }
 
 void TWinControl::Realign() {

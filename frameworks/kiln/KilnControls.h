@@ -60,8 +60,9 @@ inline constexpr TCursor crSizeAll = -22;
 
 /// The text a control shows: its type record lets editors tell captions from other strings.
 FK_ALIAS(TCaption, tkUString)
-/// Position among the windowed siblings; -1 without a parent.
-FK_SUBRANGE(TTabOrder, std::int16_t, -1, 32767)
+/// Position among the windowed siblings; -1 without a parent. A parent may hold any
+/// number of children, so the type spans every position a saved module can carry.
+FK_SUBRANGE(TTabOrder, std::int32_t, -1, 2147483647)
 
 /// The pixels per inch a control is laid out for when nothing else is known.
 inline constexpr int DefaultPPI = 96;
@@ -264,6 +265,7 @@ class FK_API TWinControl : public TControl {
 
   // Tab order ---------------------------------------------------------------
   /// The position among the parent's windowed children in tab order; -1 without parent.
+  /// Complexity: O(1), after a renumbering of the siblings once the order changed.
   int TabOrder() const noexcept;
   /// Moves within the parent's tab order; the value is clamped. Without a parent it is
   /// kept and applied when the control gets one.
@@ -303,8 +305,16 @@ private:
   friend class TControl;
   void Attach(TControl* Child);
   void Detach(TControl* Child) noexcept;
+  /// Makes room for one more child without copying the lists for each one.
+  void ReserveForChild(bool Windowed);
+  /// Brings each tab-list member's cached position up to date.
+  void RenumberTabList() const noexcept;
   std::vector<TControl*> FControls;
   std::vector<TWinControl*> FTabList;
+  /// This control's index in its parent's tab list while the parent's list is numbered.
+  mutable int FTabIndex = -1;
+  /// True while some member's `FTabIndex` may be stale.
+  mutable bool FTabListStale = false;
   int FPendingTabOrder = -1;
   int FAlignLevel = 0;
   bool FAligning = false;
