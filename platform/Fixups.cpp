@@ -259,10 +259,14 @@ void GlobalFixupReferences() {
   Fixups.Compact();
   // A finder or a setter may add fix-ups (the list grows) or free objects (fix-ups die):
   // walk by index, and copy what is needed before calling out.
+  // Many fix-ups name the same few roots: look each name up once a pass.
+  std::unordered_map<String, TComponent*> RootsByName;
   for (std::size_t I = 0; I < Fixups.Size(); ++I) {
     if (!Fixups.At(I).Alive) continue;
-    String RootName = Fixups.At(I).RootName;
-    TComponent* Root = FindGlobalComponent(RootName);
+    String Key = UpperCase(Fixups.At(I).RootName);
+    auto Known = RootsByName.find(Key);
+    if (Known == RootsByName.end()) Known = RootsByName.emplace(Key, FindGlobalComponent(Fixups.At(I).RootName)).first;
+    TComponent* Root = Known->second;
     if (!Root || !Fixups.At(I).Alive) continue;
     const TGlobalFixup& F = Fixups.At(I);
     TComponent* Target = F.Path.empty() ? Root : FindNestedComponent(Root, F.Path);

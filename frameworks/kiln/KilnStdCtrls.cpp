@@ -41,8 +41,22 @@ FK_IMPLEMENT(TLabel, "KilnStdCtrls") {
   detail::PublishEnabled(B);
   detail::PublishFont(B);
   B.Property("Transparent", &TLabel::Transparent, &TLabel::SetTransparent).Default(false);
+  B.Property("FocusControl", &TLabel::FocusControl, &TLabel::SetFocusControl);
   detail::PublishVisible(B);
   detail::PublishOnClick(B);
+}
+
+void TLabel::SetFocusControl(TWinControl* Value) {
+  if (Value == FFocusControl) return;
+  // The link is kept both ways across owners, so either side may go first.
+  if (FFocusControl) RemoveFreeNotification(FFocusControl);
+  FFocusControl = Value;
+  if (Value) FreeNotification(Value);
+}
+
+void TLabel::Notification(TComponent* AComponent, TOperation Operation) {
+  inherited::Notification(AComponent, Operation);
+  if (Operation == opRemove && AComponent == FFocusControl) FFocusControl = nullptr;
 }
 
 void TLabel::Create(TComponent* AOwner) {

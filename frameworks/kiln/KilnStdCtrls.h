@@ -49,9 +49,17 @@ class FK_API TLabel : public TGraphicControl {
   void SetTransparent(bool Value) noexcept { FTransparent = Value; }
   /// Fills the background unless transparent, then writes the caption at (0, 0).
   void Paint(TCanvas* Canvas) override;
+  /// The windowed control that takes the focus for this label's accelerator; null when
+  /// none. Not owned: it clears itself when that control goes.
+  TWinControl* FocusControl() const noexcept { return FFocusControl; }
+  void SetFocusControl(TWinControl* Value);
+
+protected:
+  void Notification(TComponent* AComponent, TOperation Operation) override;
 
 private:
   bool FTransparent = false;
+  TWinControl* FFocusControl = nullptr;
 };
 
 /// A one-line text box: 121 by 23. Its text follows its name at first.

@@ -124,3 +124,23 @@ TEST_F(KilnAtScale, FreeingNestedFormsBuiltInAnyOrderLeavesNothing) {
   EXPECT_EQ(nullptr, Form->FindComponent("P7"));
   Form->Destroy();
 }
+
+TEST_F(KilnAtScale, ALabelsFocusControlStreamsByNameAndClearsWhenItGoes) {
+  TRootGuard<TForm> Form(CreateComponentOf<TForm>(nullptr));
+  Form->SetName("Form1");
+  auto* Label = Make<TLabel>(Form.P, Form.P, "Label1");
+  auto* Edit = Make<TEdit>(Form.P, Form.P, "Edit1");
+  Label->SetFocusControl(Edit);
+  TRootGuard<TForm> Again(Open<TForm>(Save(Form.P)));
+  auto* Read = static_cast<TLabel*>(Again->FindComponent("Label1"));
+  EXPECT_EQ(Again->FindComponent("Edit1"), Read->FocusControl());
+  Edit->Destroy();
+  EXPECT_EQ(nullptr, Label->FocusControl());
+  // Across owners the link holds too.
+  TRootGuard<TForm> Other(CreateComponentOf<TForm>(nullptr));
+  auto* Far = Make<TEdit>(Other.P, Other.P, "Far1");
+  Label->SetFocusControl(Far);
+  Other.P->Destroy();
+  Other.P = nullptr;
+  EXPECT_EQ(nullptr, Label->FocusControl());
+}
