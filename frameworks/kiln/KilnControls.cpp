@@ -46,8 +46,10 @@ void TControl::Create(TComponent* AOwner) {
 }
 
 void TControl::BeforeDestruction() {
-  // Leave the parent while this control and the parent are whole.
-  if (FParent) SetParent(nullptr);
+  // Leave the parent while this control and the parent are whole. A parent that goes
+  // too need not hear of it, nor this control of its new parent: both are going.
+  if (FParent && FParent->ComponentState().Contains(csDestroying)) FParent->Detach(this);
+  else if (FParent) SetParent(nullptr);
   FreeAndNil(FFont);
   // Last: nothing queued for this control may be delivered once it is gone.
   RemoveMessages(this);
