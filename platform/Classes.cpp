@@ -230,7 +230,8 @@ TComponent* TNameIndex::Find(std::string_view Name) const noexcept {
 }
 
 void TNameIndex::Insert(TComponent* Component) {
-  if ((FUsed + 1) * 4 > FSlots.size() * 3) Grow();
+  // At most half full: a lookup that misses (every new name) then probes about two slots.
+  if ((FUsed + 1) * 2 > FSlots.size()) Grow();
   std::uint64_t H = NameHash(Component->Name());
   size_t Mask = FSlots.size() - 1;
   size_t I = H & Mask;
@@ -262,7 +263,7 @@ void TNameIndex::Grow() {
   Old.swap(FSlots);
   // Tombstones are dropped; double only when live entries need it.
   size_t Size = 16;
-  while ((FCount + 1) * 2 > Size) Size *= 2;
+  while ((FCount + 1) * 4 > Size) Size *= 2;
   FSlots.assign(Size, Slot{});
   FUsed = FCount;
   size_t Mask = Size - 1;
