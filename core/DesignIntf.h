@@ -187,7 +187,9 @@ struct FK_API IClass : IInterface {
 /// Something that can be selected, seen without knowing that it is a persistent.
 struct FK_API IDesignObject : IInterface {
   FK_INTERFACE(IDesignObject, IInterface, "{E52B7B61-21A9-560D-90DA-77FEC6BD0AA8}")
+  /// Whether `Obj` is the very object behind this design object (an identity test).
   virtual bool Equals(TObject* Obj) = 0;
+  /// Whether `Obj` stands for the same thing as this one.
   virtual bool Equals(const IPtr<IDesignObject>& Obj) = 0;
   virtual IPtr<IClass> GetClassType() = 0;
   virtual String GetClassName() = 0;

@@ -131,12 +131,17 @@ private:
   TClass FClass;
 };
 
-/// Wraps one persistent, so that tool windows can treat it as a design object.
+/// Wraps one persistent, so that tool windows can treat it as a design object. Does not
+/// own the persistent.
 class FK_API TDesignObject : public TInterfacedObject, public IDesignPersistent {
   FK_CLASS(TDesignObject, TInterfacedObject)
   FK_INTERFACES(IDesignPersistent)
   explicit TDesignObject(TPersistent* APersistent = nullptr) : FPersistent(APersistent) {}
-  bool Equals(TObject* Obj) override { return Obj == FPersistent; }
+  /// The identity test of every object: whether `Obj` is this very wrapper. The wrapped
+  /// persistent, or another wrapper of it, is not; compare wrappers through the
+  /// `IDesignObject` form.
+  bool Equals(TObject* Obj) override { return Obj == static_cast<TObject*>(this); }
+  /// Whether `Obj` answers to `IDesignPersistent` and wraps the same instance.
   bool Equals(const IPtr<IDesignObject>& Obj) override;
   IPtr<IClass> GetClassType() override;
   String GetClassName() override { return FPersistent->ClassName(); }

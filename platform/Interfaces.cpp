@@ -21,6 +21,10 @@ TGUID TGUID::FromString(std::string_view Text) {
   return ParseChecked(String(Text).c_str());
 }
 
+namespace detail {
+void RaiseIntfCastError() { throw EIntfCastError(SInterfaceNotSupported); }
+} // namespace detail
+
 String TGUID::ToString() const {
   char Buf[40];
   std::snprintf(Buf, sizeof Buf, "{%08X-%04X-%04X-%02X%02X-%02X%02X%02X%02X%02X%02X}", D1, D2, D3, D4[0], D4[1],

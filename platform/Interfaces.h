@@ -3,13 +3,16 @@
 // `TGUID` identities parsed at compile time, the root interface `IInterface`,
 // the counting smart pointer `IPtr<I>` and the `FK_INTERFACE` declaration.
 // Version chains use single, non-virtual inheritance; each member names its
-// parent and answers for every older identity of its chain.
+// parent and answers for every older identity of its chain. Casts by identity:
+// `QueryAs` (null when missing), `Supports` (a Boolean), `CastAs` (raises when
+// missing).
 //
 // Example:
 //   struct FK_API IFoo60 : IInterface {
 //     FK_INTERFACE(IFoo60, IInterface, "{8E1A4C6B-0D33-4A2E-9B51-6C0F2D7E4A10}")
 //     virtual String Name() = 0;
 //   };
+//   IPtr<IFoo60> Foo = CastAs<IFoo60>(Obj);   // EIntfCastError when Obj has none
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -165,6 +168,26 @@ template <class J, class I> IPtr<J> QueryAs(I* Intf) {
   return nullptr;
 }
 template <class J, class I> IPtr<J> QueryAs(const IPtr<I>& Intf) { return QueryAs<J>(Intf.Get()); }
+
+/// The message of `EIntfCastError`: a checked cast met an object without the interface.
+FK_RESOURCESTRING(SInterfaceNotSupported, "Interface not supported");
+
+namespace detail {
+/// Raises `EIntfCastError` with `SInterfaceNotSupported`.
+[[noreturn]] FK_API void RaiseIntfCastError();
+} // namespace detail
+
+/// The checked form of `QueryAs`: a counted reference to `J`, for which the count of the
+/// object goes up by one. Raises `EIntfCastError` "Interface not supported" when `Intf`
+/// does not answer to `J`, leaving the count as it was. Null passes through as null, as
+/// a cast of nothing gives nothing: test for null first where it is an error.
+template <class J, class I> [[nodiscard]] IPtr<J> CastAs(I* Intf) {
+  if (!Intf) return nullptr;
+  IPtr<J> Result = QueryAs<J>(Intf);
+  if (!Result) detail::RaiseIntfCastError();
+  return Result;
+}
+template <class J, class I> [[nodiscard]] IPtr<J> CastAs(const IPtr<I>& Intf) { return CastAs<J>(Intf.Get()); }
 
 /// True with a counted reference in `Out`, or false with `Out` cleared.
 template <class J, class I> bool Supports(const IPtr<I>& Intf, IPtr<J>& Out) {

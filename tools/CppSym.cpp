@@ -68,29 +68,32 @@ std::size_t MaxCppSymLength = 0;
 
 void InitializeCppSym() {
   if (CppSymbols) return;
-  auto* Table = new TSymbolTable(stCaseSensitive);
+  TObjectGuard<TSymbolTable> Table(new TSymbolTable(stCaseSensitive)); // frees what was built if one fails
   std::size_t MaxLength = 0;
   for (const TWordEntry& E : CppWords) {
     Table->Insert(new TCppSymbol(detail::ShortString(E.Word), E.Token));
     if (E.Word.size() > MaxLength) MaxLength = E.Word.size();
   }
   MaxCppSymLength = MaxLength;
-  CppSymbols = Table;
+  CppSymbols = Table.Release();
 }
 
-void FinalizeCppSym() noexcept { FreeAndNil(CppSymbols); }
+void FinalizeCppSym() noexcept {
+  FreeAndNil(CppSymbols);
+  MaxCppSymLength = 0;
+}
 
 namespace CppSym {
 
 std::size_t MaxWordLength() noexcept { return MaxCppSymLength; }
 
 bool IsReservedWord(const detail::ShortString& AWord) {
-  InitializeCppSym();
+  if (!CppSymbols) detail::RaiseReservedWordsNotLoaded("C++");
   return CppSymbols->Find(AWord) != nullptr;
 }
 
 bool IsReservedWord(std::string_view AWord) {
-  InitializeCppSym();
+  if (!CppSymbols) detail::RaiseReservedWordsNotLoaded("C++");
   detail::ShortString Key;
   return detail::ReservedWordKey(AWord, MaxCppSymLength, Key) && IsReservedWord(Key);
 }

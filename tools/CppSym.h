@@ -4,11 +4,18 @@
 // matters, in a symbol table with a token for each word, and the test a code
 // generator makes before it uses a name as an identifier.
 //
+// The table lives exactly as long as the unit: `InitializeCppSym` builds it when
+// the unit starts, `FinalizeCppSym` frees it when the unit stops, and nothing in
+// between changes it. A lookup never builds it: asked before the start or after
+// the stop, it raises.
+//
 // Example:
+//   InitializeCppSym();                       // at the unit's start
 //   CppSym::IsReservedWord("class");          // true
 //   CppSym::IsReservedWord("Class");          // false: case matters here
 //   auto* Sym = static_cast<TCppSymbol*>(CppSymbols->Find("public"));
 //   Sym->Token;                               // 9
+//   FinalizeCppSym();                         // at the unit's stop: the table is null again
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -29,24 +36,26 @@ class FK_API TCppSymbol : public TBaseSymbol {
   std::uint8_t Token = 0;
 };
 
-/// The 199 reserved words, case-sensitive; null before `InitializeCppSym` and
-/// after `FinalizeCppSym`. Read-only in between.
+/// The 199 reserved words, case-sensitive; owned by the unit. Null before
+/// `InitializeCppSym` and after `FinalizeCppSym`, read-only in between.
 extern FK_API TSymbolTable* CppSymbols;
 
-/// Builds `CppSymbols` from the word list; does nothing when it exists.
+/// The unit's start: builds `CppSymbols` and notes the longest word; does nothing
+/// when the table exists. A failure leaves the table null.
 FK_API void InitializeCppSym();
-/// Frees `CppSymbols` and its symbols.
+/// The unit's stop: frees `CppSymbols` with its symbols and sets it to null.
 FK_API void FinalizeCppSym() noexcept;
 
 namespace CppSym {
 
-/// The length of the longest reserved word, in characters.
+/// The length of the longest reserved word, in characters; 0 while the unit is stopped.
 FK_API std::size_t MaxWordLength() noexcept;
-/// Whether the word stands in the table in exactly this letter case.
+/// Whether the word stands in the table in exactly this letter case. Raises
+/// `EInvalidOperation` "The C++ reserved words are not loaded" while the unit is stopped.
 FK_API bool IsReservedWord(const detail::ShortString& AWord);
 /// The same for text: false at once for a word longer than the longest reserved
 /// word or with a character of U+20AC or above; otherwise the low byte of each
-/// UTF-16 unit makes the key.
+/// UTF-16 unit makes the key. Raises as above while the unit is stopped.
 FK_API bool IsReservedWord(std::string_view AWord);
 
 } // namespace CppSym

@@ -45,29 +45,32 @@ std::size_t MaxPasSymLength = 0;
 
 void InitializePasSym() {
   if (PascalSymbols) return;
-  auto* Table = new TSymbolTable(stInsensitive);
+  TObjectGuard<TSymbolTable> Table(new TSymbolTable(stInsensitive)); // frees what was built if one fails
   std::size_t MaxLength = 0;
   for (const TWordEntry& E : PascalWords) {
     Table->Insert(new TPascalSymbol(detail::ShortString(E.Word), E.Token));
     if (E.Word.size() > MaxLength) MaxLength = E.Word.size();
   }
   MaxPasSymLength = MaxLength;
-  PascalSymbols = Table;
+  PascalSymbols = Table.Release();
 }
 
-void FinalizePasSym() noexcept { FreeAndNil(PascalSymbols); }
+void FinalizePasSym() noexcept {
+  FreeAndNil(PascalSymbols);
+  MaxPasSymLength = 0;
+}
 
 namespace PasSym {
 
 std::size_t MaxWordLength() noexcept { return MaxPasSymLength; }
 
 bool IsReservedWord(const detail::ShortString& AWord) {
-  InitializePasSym();
+  if (!PascalSymbols) detail::RaiseReservedWordsNotLoaded("Pascal");
   return PascalSymbols->Find(AWord) != nullptr;
 }
 
 bool IsReservedWord(std::string_view AWord) {
-  InitializePasSym();
+  if (!PascalSymbols) detail::RaiseReservedWordsNotLoaded("Pascal");
   detail::ShortString Key;
   return detail::ReservedWordKey(AWord, MaxPasSymLength, Key) && IsReservedWord(Key);
 }

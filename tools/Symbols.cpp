@@ -8,6 +8,10 @@
 
 namespace formkit {
 
+namespace {
+FK_RESOURCESTRING(SReservedWordsNotLoaded, "The %s reserved words are not loaded");
+} // namespace
+
 //===----------------------------------------------------------------------===//
 // Short strings and case folding
 //===----------------------------------------------------------------------===//
@@ -129,6 +133,10 @@ bool ReservedWordKey(std::string_view AWord, std::size_t AMaxLength, ShortString
     AKey.PushBack(static_cast<char>(U & 0xFF));
   }
   return true;
+}
+
+void RaiseReservedWordsNotLoaded(const char* Language) {
+  throw EInvalidOperation(SReservedWordsNotLoaded, Language);
 }
 
 } // namespace detail

@@ -72,6 +72,10 @@ FK_API bool SameShortText(const ShortString& A, const ShortString& B);
 /// reserved, and no hash is asked of it.
 FK_API bool ReservedWordKey(std::string_view AWord, std::size_t AMaxLength, ShortString& AKey);
 
+/// Raises `EInvalidOperation` "The %s reserved words are not loaded" for a lookup in a
+/// reserved-word table whose unit has not started or has already stopped.
+[[noreturn]] FK_API void RaiseReservedWordsNotLoaded(const char* Language);
+
 } // namespace detail
 
 /// Whether a table tells letter case apart.

@@ -92,7 +92,8 @@ TComponent* TComponentRoot::DoCreateComponent(const IPtr<IInternalPaletteItem>& 
     }
     TNewComponentGuard Guard{Component};
     ValidateComponent(Component);
-    if (!Component->ComponentStyle().Contains(csInheritable) && FRootUpdateManager)
+    if (!Component->ComponentStyle().Contains(csInheritable) && FRootUpdateManager &&
+        FRootUpdateManager->GetHasDescendents())
       throw EComponentDesignerException(sCannotInherit, Component->ClassName());
 
     IPtr<IItem> Item = FSurface->ItemFromComponent(Component);

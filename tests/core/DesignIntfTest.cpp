@@ -75,7 +75,6 @@ TEST(DesignObjects, WrappersCompareByWhatTheyWrap) {
   IPtr<IDesignObject> B = PersistentToDesignObject(Child);
   EXPECT_NE(A.Get(), B.Get()); // a new wrapper each time
   EXPECT_TRUE(A->Equals(B));
-  EXPECT_TRUE(A->Equals(static_cast<TObject*>(Child)));
   EXPECT_FALSE(A->Equals(PersistentToDesignObject(Host)));
   EXPECT_EQ(A->GetComponentIndex(), 0);
   EXPECT_EQ(A->GetComponentName(), "Child1");
@@ -99,6 +98,27 @@ TEST(DesignObjects, WrappersCompareByWhatTheyWrap) {
   Host->Destroy();
 }
 
+TEST(DesignObjects, TheObjectFormOfEqualsIsTheIdentityOfTheWrapperItself) {
+  TComponent* Child = CreateComponentOf<TComponent>(nullptr);
+  IPtr<TDesignObject> A = New<TDesignObject>(Child);
+  IPtr<TDesignObject> B = New<TDesignObject>(Child);
+  IPtr<IDesignObject> AsDesignObject = PersistentToDesignObject(Child);
+
+  EXPECT_TRUE(A->Equals(static_cast<TObject*>(A.Get())));
+  // Neither the wrapped component nor another wrapper of it is this object...
+  EXPECT_FALSE(A->Equals(static_cast<TObject*>(Child)));
+  EXPECT_FALSE(A->Equals(static_cast<TObject*>(B.Get())));
+  EXPECT_FALSE(A->Equals(static_cast<TObject*>(nullptr)));
+  // ...though all of them wrap the same instance.
+  EXPECT_TRUE(A->Equals(InterfaceOf<IDesignObject>(B.Get())));
+  EXPECT_TRUE(A->Equals(AsDesignObject));
+  // Through the interface, as tool windows call it.
+  IPtr<IDesignObject> Seen = InterfaceOf<IDesignObject>(A.Get());
+  EXPECT_TRUE(Seen->Equals(static_cast<TObject*>(A.Get())));
+  EXPECT_FALSE(Seen->Equals(static_cast<TObject*>(Child)));
+  Child->Destroy();
+}
+
 TEST(DesignerSelections, OrderMattersForEquality) {
   TComponent* Owner = CreateComponentOf<TComponent>(nullptr);
   TComponent* X = CreateComponentOf<TComponent>(Owner);
@@ -115,7 +135,7 @@ TEST(DesignerSelections, OrderMattersForEquality) {
   EXPECT_FALSE(First->Equals(nullptr));
   First->Add(X); // no duplicate check
   EXPECT_EQ(First->GetCount(), 3);
-  EXPECT_TRUE(First->GetDesignObject(2)->Equals(static_cast<TObject*>(X)));
+  EXPECT_TRUE(First->GetDesignObject(2)->Equals(PersistentToDesignObject(X)));
   EXPECT_THROW(First->Get(3), EListError);
   Owner->Destroy();
 }

@@ -120,6 +120,36 @@ TEST(Interfaces, SupportsAnswersCountedOrNull) {
   EXPECT_EQ(Alive, 0); // the last release freed it
 }
 
+TEST(Interfaces, CheckedCastCountsWhatItGivesAndRaisesWhenTheInterfaceIsMissing) {
+  {
+    IPtr<TGreeter> Obj = New<TGreeter>();
+    IPtr<ICounter> Counter = QueryAs<ICounter>(Obj.Get());
+    ASSERT_EQ(Obj->RefCount(), 2);
+
+    // Across the families of one object and down a version chain: one reference each.
+    IPtr<IGreeter70> Greeter = CastAs<IGreeter70>(Counter);
+    EXPECT_EQ(Obj->RefCount(), 3);
+    EXPECT_EQ(Greeter->Goodbye(), "goodbye");
+    IPtr<IGreeter> Newest = CastAs<IGreeter>(Obj.Get());
+    EXPECT_EQ(Obj->RefCount(), 4);
+    EXPECT_EQ(Newest->Count(), 3);
+    Greeter = nullptr;
+    Newest = nullptr;
+    EXPECT_EQ(Obj->RefCount(), 2);
+
+    // A missing interface raises and takes no reference; nothing passes through as nothing.
+    try {
+      (void)CastAs<IUnrelated>(Counter);
+      ADD_FAILURE() << "the cast gave an interface the object does not have";
+    } catch (const EIntfCastError& E) {
+      EXPECT_EQ(E.Message(), "Interface not supported");
+    }
+    EXPECT_EQ(Obj->RefCount(), 2);
+    EXPECT_EQ(CastAs<ICounter>(IPtr<IGreeter60>()), nullptr);
+  }
+  EXPECT_EQ(Alive, 0);
+}
+
 TEST(Interfaces, AnObjectNobodyHoldsDiesWithTheOutValueOfSupports) {
   auto* Raw = new TGreeter; // count 1 from its constructor, as if New had not adopted it
   Raw->DropOwnReference();

@@ -220,7 +220,18 @@ TEST(SymbolListTest, GrowsByDoublingAndDoesNotOwn) {
 // Reserved words
 //===----------------------------------------------------------------------===//
 
-TEST(PasSymTest, WordsAreFoundInAnyCase) {
+/// The units of the reserved words started, as a program starts them before its first
+/// lookup: in a shuffled run the test that stops them may come just before.
+struct ReservedWords : ::testing::Test {
+  void SetUp() override {
+    InitializePasSym();
+    InitializeCppSym();
+  }
+};
+using PasSymTest = ReservedWords;
+using CppSymTest = ReservedWords;
+
+TEST_F(PasSymTest, WordsAreFoundInAnyCase) {
   for (const char* W : {"begin", "BEGIN", "Begin", "resourcestring", "Xor", "DispInterface"})
     EXPECT_TRUE(PasSym::IsReservedWord(W)) << W;
   for (const char* W : {"", "beginn", "integer", "self", "begi"}) EXPECT_FALSE(PasSym::IsReservedWord(W)) << W;
@@ -229,12 +240,11 @@ TEST(PasSymTest, WordsAreFoundInAnyCase) {
   EXPECT_EQ(PasSym::MaxWordLength(), 14u);
 }
 
-TEST(PasSymTest, Tokens) {
+TEST_F(PasSymTest, Tokens) {
   auto TokenOf = [](const char* W) {
     auto* S = static_cast<TPascalSymbol*>(PascalSymbols->Find(W));
     return S ? S->Token : 0;
   };
-  InitializePasSym();
   EXPECT_EQ(TokenOf("array"), 5);
   EXPECT_EQ(TokenOf("Begin"), 20);
   EXPECT_EQ(TokenOf("set"), 34);
@@ -245,8 +255,7 @@ TEST(PasSymTest, Tokens) {
   EXPECT_EQ(TokenOf("program"), SymReservedWord);
 }
 
-TEST(PasSymTest, TooLongWordIsRefusedBeforeAnyLookup) {
-  InitializePasSym();
+TEST_F(PasSymTest, TooLongWordIsRefusedBeforeAnyLookup) {
   // A longer word placed in the table is still not reserved through the text form.
   auto* Long = new TPascalSymbol(ShortString("NOTRESERVEDATALL"), SymReservedWord);
   PascalSymbols->Insert(Long);
@@ -256,8 +265,7 @@ TEST(PasSymTest, TooLongWordIsRefusedBeforeAnyLookup) {
   Long->Destroy();
 }
 
-TEST(PasSymTest, NonAsciiTextUsesTheLowByteOfEachCharacterBelowTheEuroSign) {
-  InitializePasSym();
+TEST_F(PasSymTest, NonAsciiTextUsesTheLowByteOfEachCharacterBelowTheEuroSign) {
   // U+0142 has the low byte of "B"; below U+20AC the low byte is what is looked up.
   EXPECT_TRUE(PasSym::IsReservedWord("\xC5\x82" "egin"));
   // U+00AC and U+20AC share the low byte 0xAC: only the first is looked up at all.
@@ -271,7 +279,7 @@ TEST(PasSymTest, NonAsciiTextUsesTheLowByteOfEachCharacterBelowTheEuroSign) {
   EXPECT_FALSE(PasSym::IsReservedWord("b\xC3\xA9gin")); // é
 }
 
-TEST(CppSymTest, WordsAreFoundOnlyInTheirOwnCase) {
+TEST_F(CppSymTest, WordsAreFoundOnlyInTheirOwnCase) {
   for (const char* W : {"class", "_Bool", "__published", "char16_t", "static_assert",
                         "__has_nothrow_default_constructor", "while"})
     EXPECT_TRUE(CppSym::IsReservedWord(W)) << W;
@@ -282,8 +290,7 @@ TEST(CppSymTest, WordsAreFoundOnlyInTheirOwnCase) {
   EXPECT_EQ(CppSym::MaxWordLength(), 33u);
 }
 
-TEST(CppSymTest, Tokens) {
-  InitializeCppSym();
+TEST_F(CppSymTest, Tokens) {
   auto TokenOf = [](const char* W) {
     auto* S = static_cast<TCppSymbol*>(CppSymbols->Find(W));
     return S ? S->Token : 0;
@@ -296,17 +303,51 @@ TEST(CppSymTest, Tokens) {
   EXPECT_EQ(TokenOf("virtual"), SymReservedWord);
 }
 
-TEST(ReservedWordTablesTest, FinalizeFreesAndTheNextUseBuildsAgain) {
+TEST(ReservedWordTablesTest, LiveFromTheUnitsStartToItsStopAndALookupNeverBuildsThem) {
+  // Stopped, as before the program's start or after its end.
   FinalizeCppSym();
   FinalizePasSym();
-  EXPECT_EQ(CppSymbols, nullptr);
   EXPECT_EQ(PascalSymbols, nullptr);
+  EXPECT_EQ(CppSymbols, nullptr);
+  EXPECT_EQ(PasSym::MaxWordLength(), 0u);
+  EXPECT_EQ(CppSym::MaxWordLength(), 0u);
+
+  // A lookup while stopped is refused and brings no table into being.
+  try {
+    (void)PasSym::IsReservedWord("begin");
+    ADD_FAILURE() << "a lookup built the Pascal table";
+  } catch (const EInvalidOperation& E) {
+    EXPECT_STREQ(E.what(), "The Pascal reserved words are not loaded");
+  }
+  try {
+    (void)CppSym::IsReservedWord(ShortString("class"));
+    ADD_FAILURE() << "a lookup built the C++ table";
+  } catch (const EInvalidOperation& E) {
+    EXPECT_STREQ(E.what(), "The C++ reserved words are not loaded");
+  }
+  EXPECT_EQ(PascalSymbols, nullptr);
+  EXPECT_EQ(CppSymbols, nullptr);
+
+  // The start builds each whole table before any lookup.
+  InitializePasSym();
+  InitializeCppSym();
+  ASSERT_NE(PascalSymbols, nullptr);
+  ASSERT_NE(CppSymbols, nullptr);
+  EXPECT_EQ(PascalSymbols->Count(), 71);
+  EXPECT_EQ(CppSymbols->Count(), 199);
+  EXPECT_EQ(PasSym::MaxWordLength(), 14u);
+  EXPECT_EQ(CppSym::MaxWordLength(), 33u);
+
+  // A second start and the lookups leave the very same tables.
+  TSymbolTable* Pascal = PascalSymbols;
+  TSymbolTable* Cpp = CppSymbols;
+  InitializePasSym();
+  InitializeCppSym();
+  EXPECT_TRUE(PasSym::IsReservedWord("Begin"));
   EXPECT_TRUE(CppSym::IsReservedWord("nullptr"));
-  EXPECT_NE(CppSymbols, nullptr);
-  InitializePasSym();
-  TSymbolTable* Built = PascalSymbols;
-  InitializePasSym();
-  EXPECT_EQ(PascalSymbols, Built);
+  EXPECT_EQ(PascalSymbols, Pascal);
+  EXPECT_EQ(CppSymbols, Cpp);
+  EXPECT_EQ(PascalSymbols->Count(), 71);
 }
 
 } // namespace

@@ -17,9 +17,32 @@ class TZeroControl : public TControl {
 
 TRect BoundsOf(TComponent* C) { return static_cast<TControl*>(C)->BoundsRect(); }
 
+/// A non-visual component whose class does not support inheritance.
+class TLoneTimer : public TTimer {
+  FK_CLASS(TLoneTimer, TTimer)
+  void Create(TComponent* AOwner) override {
+    inherited::Create(AOwner);
+    SetComponentStyle(ComponentStyle().Exclude(csInheritable));
+  }
+};
+
+/// The update manager of a module whose family the test decides.
+class TFamilyManager : public TInterfacedObject, public IUpdateManager {
+  FK_CLASS(TFamilyManager, TInterfacedObject)
+  FK_INTERFACES(IUpdateManager)
+  bool GetHasDescendents() override {
+    ++Asked;
+    return HasDescendents;
+  }
+  bool HasDescendents = false;
+  int Asked = 0;
+};
+
 } // namespace
 
 FK_IMPLEMENT(TZeroControl, "Tests") {}
+FK_IMPLEMENT(TLoneTimer, "Tests") {}
+FK_IMPLEMENT(TFamilyManager, "Tests") {}
 
 struct CreationTest : KilnDesignFixture {
   IPtr<IRoot> Root;
@@ -118,4 +141,40 @@ TEST_F(CreationTest, ADataModuleRefusesControls) {
     EXPECT_EQ(E.Message(), "Controls cannot be added to a data module (TButton)");
   }
   EXPECT_EQ(Data->GetRoot()->ComponentCount(), 1); // the refused button is gone
+}
+
+TEST_F(CreationTest, AClassWithoutInheritanceIsRefusedOnlyWhileTheModuleHasDescendants) {
+  IPtr<TFamilyManager> Family = New<TFamilyManager>();
+  auto Saved = TRootHooks::CreateUpdateManager;
+  TRootHooks::CreateUpdateManager = [&](TComponentRoot&, TComponent*, TComponent*, const IPtr<IUpdateManager>&) {
+    return InterfaceOf<IUpdateManager>(Family.Get());
+  };
+  auto Restore = Finally([&]() noexcept { std::swap(TRootHooks::CreateUpdateManager, Saved); });
+  IPtr<IRoot> Managed = NewForm("Form2");
+  TKilnRoot* Root = KilnRoot(Managed);
+  TComponent* Form2 = Managed->GetRoot();
+  ASSERT_EQ(QueryAs<IInternalRoot>(Managed)->GetUpdateManager().Get(), static_cast<IUpdateManager*>(Family.Get()));
+
+  // A module with an update manager but no descendant takes the class.
+  Root->CreateComponentPos(Tool(TLoneTimer::StaticClass()), 40, 40);
+  EXPECT_NE(Form2->FindComponent("LoneTimer1"), nullptr);
+  EXPECT_GE(Family->Asked, 1);
+
+  // Once a descendant is open, the class is refused and the new component freed; the
+  // module is not modified and the selection stays.
+  Family->HasDescendents = true;
+  int Modifications = Log.Count("Modified");
+  try {
+    Root->CreateComponentPos(Tool(TLoneTimer::StaticClass()), 80, 80);
+    FAIL();
+  } catch (const EComponentDesignerException& E) {
+    EXPECT_EQ(E.Message(), "Component class 'TLoneTimer' does not support inheritance and cannot be added to a "
+                           "module that has descendents");
+  }
+  EXPECT_EQ(Form2->ComponentCount(), 1);
+  EXPECT_EQ(Log.Count("Modified"), Modifications);
+  EXPECT_EQ(Root->SelectedComponent(), Form2->FindComponent("LoneTimer1"));
+  // A class that supports inheritance is still welcome.
+  Root->CreateComponentPos(Tool(TTimer::StaticClass()), 120, 120);
+  EXPECT_NE(Form2->FindComponent("Timer1"), nullptr);
 }
