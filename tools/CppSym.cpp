@@ -83,6 +83,18 @@ void FinalizeCppSym() noexcept {
   MaxCppSymLength = 0;
 }
 
+namespace {
+/// The unit's load and unload: a program that links the unit has the table from its
+/// start to its end, before anything asks for a word.
+struct TCppSymUnit {
+  TCppSymUnit() { InitializeCppSym(); }
+  ~TCppSymUnit() { FinalizeCppSym(); }
+  TCppSymUnit(const TCppSymUnit&) = delete;
+  TCppSymUnit& operator=(const TCppSymUnit&) = delete;
+};
+const TCppSymUnit CppSymUnit;
+} // namespace
+
 namespace CppSym {
 
 std::size_t MaxWordLength() noexcept { return MaxCppSymLength; }

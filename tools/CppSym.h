@@ -5,17 +5,15 @@
 // generator makes before it uses a name as an identifier.
 //
 // The table lives exactly as long as the unit: `InitializeCppSym` builds it when
-// the unit starts, `FinalizeCppSym` frees it when the unit stops, and nothing in
-// between changes it. A lookup never builds it: asked before the start or after
-// the stop, it raises.
+// the unit starts (when the program that links it starts), `FinalizeCppSym` frees
+// it when the unit stops (at the program's end), and nothing in between changes
+// it. A lookup never builds it: asked after an explicit stop, it raises.
 //
 // Example:
-//   InitializeCppSym();                       // at the unit's start
 //   CppSym::IsReservedWord("class");          // true
 //   CppSym::IsReservedWord("Class");          // false: case matters here
 //   auto* Sym = static_cast<TCppSymbol*>(CppSymbols->Find("public"));
 //   Sym->Token;                               // 9
-//   FinalizeCppSym();                         // at the unit's stop: the table is null again
 //
 //===----------------------------------------------------------------------===//
 #pragma once

@@ -60,6 +60,18 @@ void FinalizePasSym() noexcept {
   MaxPasSymLength = 0;
 }
 
+namespace {
+/// The unit's load and unload: a program that links the unit has the table from its
+/// start to its end, before anything asks for a word.
+struct TPasSymUnit {
+  TPasSymUnit() { InitializePasSym(); }
+  ~TPasSymUnit() { FinalizePasSym(); }
+  TPasSymUnit(const TPasSymUnit&) = delete;
+  TPasSymUnit& operator=(const TPasSymUnit&) = delete;
+};
+const TPasSymUnit PasSymUnit;
+} // namespace
+
 namespace PasSym {
 
 std::size_t MaxWordLength() noexcept { return MaxPasSymLength; }

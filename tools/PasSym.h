@@ -5,17 +5,15 @@
 // makes before it uses a name as an identifier.
 //
 // The table lives exactly as long as the unit: `InitializePasSym` builds it when
-// the unit starts, `FinalizePasSym` frees it when the unit stops, and nothing in
-// between changes it. A lookup never builds it: asked before the start or after
-// the stop, it raises.
+// the unit starts (when the program that links it starts), `FinalizePasSym` frees
+// it when the unit stops (at the program's end), and nothing in between changes
+// it. A lookup never builds it: asked after an explicit stop, it raises.
 //
 // Example:
-//   InitializePasSym();                       // at the unit's start
 //   PascalSymbols->Count();                   // 71, before any lookup
 //   PasSym::IsReservedWord("Begin");          // true
 //   auto* Sym = static_cast<TPascalSymbol*>(PascalSymbols->Find("type"));
 //   Sym->Token;                               // 23
-//   FinalizePasSym();                         // at the unit's stop: the table is null again
 //
 //===----------------------------------------------------------------------===//
 #pragma once

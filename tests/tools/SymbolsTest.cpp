@@ -351,3 +351,11 @@ TEST(ReservedWordTablesTest, LiveFromTheUnitsStartToItsStopAndALookupNeverBuilds
 }
 
 } // namespace
+
+TEST(ReservedWordTablesTest, ExistFromTheProgramsStartWithoutAnyCall) {
+  // Nothing in this test starts the units: linking them is enough.
+  ASSERT_NE(PascalSymbols, nullptr);
+  ASSERT_NE(CppSymbols, nullptr);
+  EXPECT_EQ(71, PascalSymbols->Count());
+  EXPECT_TRUE(CppSym::IsReservedWord("namespace"));
+}
