@@ -1,17 +1,29 @@
 # The commands a person types. Each installs what a fresh machine lacks first.
-.PHONY: test bench release deps clean
+.PHONY: test fuzz bench test-build release deps clean
 
 deps:
 	@bash scripts/install-deps
 
-test: deps
+# clang under AddressSanitizer, UndefinedBehaviorSanitizer and LeakSanitizer, with the fuzz targets.
+test-build: deps
 	cmake --preset test
 	cmake --build --preset test
-	ctest --preset test
 
+# g++ -O2: the libraries, their tests and the benchmarks.
 release: deps
 	cmake --preset release
 	cmake --build --preset release
+
+# Both compilers, because each finds faults the other misses: the sanitizer build's tests and
+# bounded fuzz runs first, then the g++ build's tests, whose CTest summary ends the output.
+test: test-build
+	ctest --preset test
+	cmake --preset release
+	cmake --build --preset release
+	ctest --preset release
+
+fuzz: test-build
+	bash scripts/fuzz-campaign
 
 bench: release
 	@for b in build/release/bench/*/fk_bench_*; do echo "== $$b"; $$b --benchmark_min_time=0.2; done

@@ -430,6 +430,7 @@ TEST(DesignCore, StartsInStageOrderAndStopsInReverse) {
 }
 
 TEST(DesignCore, InitializeDesignersRunsEachProcedureOnceThenTheStringsFileSystem) {
+  InitOrder.clear();
   std::vector<String> FileSystem;
   RegisterStringsFileSystemProc = [&](bool Register) { FileSystem.push_back(Register ? "register" : "unregister"); };
   StartDesignCore();

@@ -9,8 +9,8 @@
 // bookkeeping under test is the real one); `ValidateModification` can be made
 // to refuse. What the surface is asked goes into `Log`, one line a call.
 //
-// The definitions are in tests/surface/TestSurface.cpp, because they need the
-// surface library and the core tests share this folder.
+// The definitions are in tests/fakes/TestSurface.cpp, in the test-support library
+// with the other fakes.
 //
 // Example:
 //   IPtr<TTestSurface> S = New<TTestSurface>();

@@ -1,4 +1,4 @@
-//===- tests/surface/TestSurface.cpp - The headless design surface -------===//
+//===- tests/fakes/TestSurface.cpp - The headless design surface ---------===//
 #include "tests/fakes/TestSurface.h"
 
 namespace formkit::fakes {
