@@ -480,13 +480,9 @@ TComponent* CreateComponent(TClass Class, TComponent* Owner) {
 }
 
 void RunConstructor(TComponent* Instance, TComponent* Owner) {
-  try {
-    Instance->Create(Owner);
-    Instance->AfterConstruction();
-  } catch (...) {
-    Instance->Destroy();
-    throw;
-  }
+  auto Free = OnFailure([Instance]() noexcept { Instance->Destroy(); });
+  Instance->Create(Owner);
+  Instance->AfterConstruction();
 }
 
 //===----------------------------------------------------------------------===//
@@ -548,13 +544,9 @@ TCollectionItem* TCollection::Items(int Index) const {
 TCollectionItem* TCollection::Add() {
   TClass Class = FItemClass ? FItemClass : TCollectionItem::StaticClass();
   auto* Item = static_cast<TCollectionItem*>(Class->NewInstance());
-  try {
-    Item->Create(this);
-    Item->AfterConstruction();
-  } catch (...) {
-    Item->Destroy();
-    throw;
-  }
+  auto Free = OnFailure([Item]() noexcept { Item->Destroy(); });
+  Item->Create(this);
+  Item->AfterConstruction();
   return Item;
 }
 
@@ -591,13 +583,12 @@ void TCollection::Assign(TPersistent* Source) {
     return;
   }
   BeginUpdate();
-  try {
-    Clear();
-    for (TCollectionItem* Item : Other->FItems) Add()->Assign(Item);
-  } catch (...) {
-    EndUpdate();
-    throw;
-  }
+  // Ending the update tells the collection's owner, which may fail: after a failure here
+  // that one passes on; after success, its own does.
+  auto End = OnFailure([this]() noexcept { RunIgnoringExceptions([this] { EndUpdate(); }); });
+  Clear();
+  for (TCollectionItem* Item : Other->FItems) Add()->Assign(Item);
+  End.Dismiss();
   EndUpdate();
 }
 

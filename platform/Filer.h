@@ -259,7 +259,7 @@ class FK_API TReader : public TFiler {
   /// Resolves the references collected and calls `Loaded` on the components read.
   void FixupReferences();
   /// Drops what `BeginReferences` collected.
-  void EndReferences();
+  void EndReferences() noexcept;
 
   void DefineProperty(const String& Name, const TReaderProc& ReadData, const TWriterProc& WriteData,
                       bool HasData) override;
@@ -269,7 +269,7 @@ class FK_API TReader : public TFiler {
   void FlushBuffer() override;
 
   /// Offers `Message` to `OnError`; true when the handler said to go on.
-  virtual bool Error(const String& Message);
+  [[nodiscard]] virtual bool Error(const String& Message);
   /// The code of method `Name` of `Root`, through `OnFindMethod`; null when absent.
   virtual void* FindMethod(TComponent* Root, const String& MethodName);
   /// The class named `ClassName`: the registry, then `OnFindComponentClass`; raises
@@ -285,6 +285,9 @@ private:
   std::uint8_t ReadByte();
   void ReadDataInner(TComponent* Instance);
   void ReadPropValue(TPersistent* Instance, PPropInfo Prop);
+  /// A class or interface property: nil, a reference by name (fixed up later), or the
+  /// items of a collection.
+  void ReadObjectValue(TPersistent* Instance, PPropInfo Prop, TTypeKind Kind);
   void CheckLength(std::int64_t Length);
   void EnterNesting();
   void DoFixupReferences();
@@ -292,6 +295,8 @@ private:
   /// and moved; their pending references go too.
   void DropCreatedAfter(std::size_t LoadedIndex) noexcept;
   static void RestoreParent(const detail::TLoadedEntry& Entry) noexcept;
+  /// Takes the loading and reading flags off everything this read holds, after a failure.
+  void ClearLoadingFlags() noexcept;
   /// Drops the pending references into items of `Collection`, which is about to be cleared.
   void ForgetFixupsInto(TCollection* Collection);
 
@@ -378,7 +383,20 @@ class FK_API TWriter : public TFiler {
 
 private:
   void WriteProperty(TPersistent* Instance, PPropInfo Prop);
+  /// A class property: a collection's items, a sub-object's properties, or a reference.
+  void WriteObjectProperty(TPersistent* Instance, PPropInfo Prop);
+  /// The properties of a sub-object, named through the property that holds it.
+  void WriteSubProperties(TPersistent* Sub, PPropInfo Prop);
+  void WriteInterfaceProperty(TPersistent* Instance, PPropInfo Prop);
+  void WriteMethodProperty(TPersistent* Instance, PPropInfo Prop);
+  /// An ordinal, set, float, string or variant property.
+  void WriteValueProperty(TPersistent* Instance, PPropInfo Prop);
   void WriteChild(TComponent* Child);
+  /// Whether a reader would have `Instance` elsewhere among its parent's children, so
+  /// that its position must be written; keeps the order the reader will have.
+  bool TakesChildPosition(TComponent* Instance);
+  /// The children of `Instance`, each compared with the ancestor's child of its name.
+  void WriteChildren(TComponent* Instance);
 
   TComponent* FRootAncestor = nullptr;
   String FPropPath;
@@ -439,7 +457,7 @@ FK_API bool IsGlobalLoading();
 /// Finds a loaded root by name for cross-root references.
 using TFindGlobalComponent = std::function<TComponent*(const String& Name)>;
 /// Adds a finder of roots by name; returns a token for `UnregisterFindGlobalComponentProc`.
-FK_API int RegisterFindGlobalComponentProc(TFindGlobalComponent Proc);
+[[nodiscard]] FK_API int RegisterFindGlobalComponentProc(TFindGlobalComponent Proc);
 FK_API void UnregisterFindGlobalComponentProc(int Token);
 /// The root of that name: the registered finders (last first), then the roots of the
 /// open loading brackets; null when none.
@@ -472,7 +490,7 @@ FK_API void SetReferenceProp(TPersistent* Instance, PPropInfo Prop, TComponent* 
 /// The component that `Path` names below `LookupRoot` (or `LookupRoot` itself).
 FK_API TComponent* FindReference(TComponent* LookupRoot, const String& Path);
 /// Records components loaded by a reader in the innermost bracket; false outside one.
-FK_API bool AddGlobalLoaded(const std::vector<TComponent*>& Components);
+[[nodiscard]] FK_API bool AddGlobalLoaded(const std::vector<TComponent*>& Components);
 /// Forgets `Components` in every bracket (after a failed read).
 FK_API void RemoveGlobalLoaded(const std::vector<TComponent*>& Components);
 } // namespace detail

@@ -8,9 +8,11 @@
 //
 // Example:
 //   BeginGlobalLoading();
-//   try { Reader->ReadRootComponent(Root); NotifyGlobalLoading(); } catch (...) {
-//     EndGlobalLoading(); throw; }
-//   EndGlobalLoading();
+//   {
+//     auto End = Finally([]() noexcept { EndGlobalLoading(); });
+//     Reader->ReadRootComponent(Root);
+//     NotifyGlobalLoading();
+//   }
 //   GetFixupReferenceNames(Root, Names);   // roots still to be opened
 //
 //===----------------------------------------------------------------------===//
@@ -23,17 +25,13 @@
 
 namespace formkit {
 
-namespace detail {
+namespace {
 
 /// Hears of the destruction of the roots that loading lists name.
 class TFixupWatcher : public TComponent {
   FK_CLASS(TFixupWatcher, TComponent)
   void Notification(TComponent* AComponent, TOperation Operation) override;
 };
-
-} // namespace detail
-
-namespace {
 
 /// A reference into a root that is not loaded yet: written into `Prop` of `Instance`
 /// (which `Holder` holds, in module `Root`) once `RootName` is found.
@@ -133,7 +131,7 @@ struct TFixupState {
   std::vector<std::vector<TComponent*>> Loading;
   std::vector<std::pair<int, TFindGlobalComponent>> Finders;
   int NextToken = 1;
-  detail::TFixupWatcher* Watcher = nullptr;
+  TFixupWatcher* Watcher = nullptr; // immortal, like the state
 };
 
 TFixupState& State() {
@@ -143,7 +141,7 @@ TFixupState& State() {
 
 void Watch(TComponent* C) {
   TFixupState& S = State();
-  if (!S.Watcher) S.Watcher = static_cast<detail::TFixupWatcher*>(CreateComponent(detail::TFixupWatcher::StaticClass(), nullptr));
+  if (!S.Watcher) S.Watcher = CreateComponentOf<TFixupWatcher>(nullptr);
   if (C && C != S.Watcher) S.Watcher->FreeNotification(C);
 }
 
@@ -153,10 +151,6 @@ bool IsOwnedBy(TComponent* C, TComponent* Owner) {
   return false;
 }
 
-} // namespace
-
-namespace detail {
-
 FK_IMPLEMENT(TFixupWatcher, "Classes") {}
 
 void TFixupWatcher::Notification(TComponent* AComponent, TOperation Operation) {
@@ -164,6 +158,10 @@ void TFixupWatcher::Notification(TComponent* AComponent, TOperation Operation) {
   if (Operation != opRemove) return;
   for (auto& List : State().Loading) std::erase_if(List, [&](TComponent* C) { return IsOwnedBy(C, AComponent); });
 }
+
+} // namespace
+
+namespace detail {
 
 void ForgetPendingReferences(TPersistent* Obj) noexcept { State().Fixups.ForgetObject(Obj); }
 

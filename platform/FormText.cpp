@@ -184,25 +184,7 @@ private:
   void Value(int Indent) {
     TValueType T = FR.NextValue();
     switch (T) {
-    case vaList: {
-      Nest Guard(FDepth);
-      FR.ReadValue();
-      if (FR.EndOfList()) {
-        FR.ReadListEnd();
-        Out += "()";
-        break;
-      }
-      Out += "(\n";
-      while (!FR.EndOfList()) {
-        Pad(Indent + 1);
-        Value(Indent + 1);
-        Out += '\n';
-      }
-      FR.ReadListEnd();
-      Pad(Indent);
-      Out += ')';
-      break;
-    }
+    case vaList: List(Indent); break;
     case vaInt8:
     case vaInt16:
     case vaInt32:
@@ -211,86 +193,115 @@ private:
     case vaDate: Float(FR.ReadFloat(), "D"); break;
     case vaString:
     case vaLString: Quote(FR.ReadString()); break;
-    case vaIdent: {
-      String Id = FR.ReadIdent();
-      CheckIdent(Id);
-      if (IsValueKeyword(Id)) Out += '&';
-      Out += Id;
-      break;
-    }
+    case vaIdent: Ident(); break;
     case vaFalse: FR.ReadValue(); Out += "False"; break;
     case vaTrue: FR.ReadValue(); Out += "True"; break;
     case vaNil: FR.ReadValue(); Out += "nil"; break;
     case vaVarNull: FR.ReadValue(); Out += "null"; break;
-    case vaBinary: {
-      FR.ReadValue();
-      std::uint8_t L[4];
-      FR.Read(L, 4);
-      std::int64_t Len = std::int64_t(L[0]) | std::int64_t(L[1]) << 8 | std::int64_t(L[2]) << 16 | std::int64_t(L[3]) << 24;
-      if (Len > FR.Remaining()) throw EReadError(SInvalidLength, static_cast<long long>(Len));
-      std::vector<std::uint8_t> Data(static_cast<std::size_t>(Len));
-      FR.Read(Data.data(), Len);
-      if (Data.empty()) {
-        Out += "{}";
-        break;
-      }
-      Out += "{\n";
-      for (std::size_t I = 0; I < Data.size(); I += 32) {
-        Pad(Indent + 1);
-        for (std::size_t J = I; J < Data.size() && J < I + 32; ++J) {
-          Out += HexDigits[Data[J] >> 4];
-          Out += HexDigits[Data[J] & 15];
-        }
-        Out += '\n';
-      }
-      Pad(Indent);
-      Out += '}';
-      break;
-    }
-    case vaSet: {
-      FR.ReadValue();
-      Out += '[';
-      bool First = true;
-      for (String E = FR.ReadStr(); !E.empty(); E = FR.ReadStr()) {
-        CheckPlainIdent(E);
-        if (!First) Out += ", ";
-        Out += E;
-        First = false;
-      }
-      Out += ']';
-      break;
-    }
-    case vaCollection: {
-      Nest Guard(FDepth);
-      FR.ReadValue();
-      if (FR.EndOfList()) {
-        FR.ReadListEnd();
-        Out += "<>";
-        break;
-      }
-      Out += "<\n";
-      while (!FR.EndOfList()) {
-        Pad(Indent + 1);
-        Out += "item";
-        TValueType N = FR.NextValue();
-        if (N == vaInt8 || N == vaInt16 || N == vaInt32 || N == vaInt64) {
-          Out += " [";
-          Integer();
-          Out += ']';
-        }
-        Out += '\n';
-        FR.ReadListBegin();
-        Properties(Indent + 2);
-        Pad(Indent + 1);
-        Out += "end\n";
-      }
-      FR.ReadListEnd();
-      Pad(Indent);
-      Out += '>';
-      break;
-    }
+    case vaBinary: Binary(Indent); break;
+    case vaSet: Set(); break;
+    case vaCollection: Collection(Indent); break;
     default: FR.ReadValue(); throw EReadError(SUnknownValueTag, static_cast<int>(T));
     }
+  }
+
+  /// "()" or one value a line between "(" and ")".
+  void List(int Indent) {
+    Nest Guard(FDepth);
+    FR.ReadValue();
+    if (FR.EndOfList()) {
+      FR.ReadListEnd();
+      Out += "()";
+      return;
+    }
+    Out += "(\n";
+    while (!FR.EndOfList()) {
+      Pad(Indent + 1);
+      Value(Indent + 1);
+      Out += '\n';
+    }
+    FR.ReadListEnd();
+    Pad(Indent);
+    Out += ')';
+  }
+
+  /// An identifier; "&" in front of one that reads like a keyword value.
+  void Ident() {
+    String Id = FR.ReadIdent();
+    CheckIdent(Id);
+    if (IsValueKeyword(Id)) Out += '&';
+    Out += Id;
+  }
+
+  /// "{}" or lines of 32 bytes in hexadecimal between "{" and "}".
+  void Binary(int Indent) {
+    FR.ReadValue();
+    std::uint8_t L[4];
+    FR.Read(L, 4);
+    std::int64_t Len = std::int64_t(L[0]) | std::int64_t(L[1]) << 8 | std::int64_t(L[2]) << 16 | std::int64_t(L[3]) << 24;
+    if (Len > FR.Remaining()) throw EReadError(SInvalidLength, static_cast<long long>(Len));
+    std::vector<std::uint8_t> Data(static_cast<std::size_t>(Len));
+    FR.Read(Data.data(), Len);
+    if (Data.empty()) {
+      Out += "{}";
+      return;
+    }
+    Out += "{\n";
+    for (std::size_t I = 0; I < Data.size(); I += 32) {
+      Pad(Indent + 1);
+      for (std::size_t J = I; J < Data.size() && J < I + 32; ++J) {
+        Out += HexDigits[Data[J] >> 4];
+        Out += HexDigits[Data[J] & 15];
+      }
+      Out += '\n';
+    }
+    Pad(Indent);
+    Out += '}';
+  }
+
+  /// The element names between "[" and "]", separated by ", ".
+  void Set() {
+    FR.ReadValue();
+    Out += '[';
+    bool First = true;
+    for (String E = FR.ReadStr(); !E.empty(); E = FR.ReadStr()) {
+      CheckPlainIdent(E);
+      if (!First) Out += ", ";
+      Out += E;
+      First = false;
+    }
+    Out += ']';
+  }
+
+  /// "<>" or the items between "<" and ">", each "item" (with its index when the data
+  /// has one), its properties and "end".
+  void Collection(int Indent) {
+    Nest Guard(FDepth);
+    FR.ReadValue();
+    if (FR.EndOfList()) {
+      FR.ReadListEnd();
+      Out += "<>";
+      return;
+    }
+    Out += "<\n";
+    while (!FR.EndOfList()) {
+      Pad(Indent + 1);
+      Out += "item";
+      TValueType N = FR.NextValue();
+      if (N == vaInt8 || N == vaInt16 || N == vaInt32 || N == vaInt64) {
+        Out += " [";
+        Integer();
+        Out += ']';
+      }
+      Out += '\n';
+      FR.ReadListBegin();
+      Properties(Indent + 2);
+      Pad(Indent + 1);
+      Out += "end\n";
+    }
+    FR.ReadListEnd();
+    Pad(Indent);
+    Out += '>';
   }
 
   TReader& FR;
@@ -539,91 +550,117 @@ private:
       ++FPos;
       FW.WriteIdent(DottedIdent("identifier expected"));
     } else if (IsIdentStart(C)) {
-      String Id = DottedIdent("value expected");
-      if (SameText(Id, "True")) FW.WriteValue(vaTrue);
-      else if (SameText(Id, "False")) FW.WriteValue(vaFalse);
-      else if (SameText(Id, "nil")) FW.WriteValue(vaNil);
-      else if (SameText(Id, "null")) FW.WriteValue(vaVarNull);
-      else FW.WriteIdent(Id);
+      IdentValue();
     } else if (C == '[') {
-      ++FPos;
-      FW.WriteValue(vaSet);
-      SkipSpace();
-      if (Peek() != ']') {
-        for (;;) {
-          SkipSpace();
-          FW.WriteStr(Ident("set element expected"));
-          SkipSpace();
-          if (Peek() == ']') break;
-          Expect(',');
-        }
-      }
-      ++FPos;
-      FW.WriteStr("");
+      SetValue();
     } else if (C == '(') {
-      Nest Guard(FDepth, *this);
-      ++FPos;
-      FW.WriteListBegin();
-      for (SkipSpace(); Peek() != ')'; SkipSpace()) {
-        if (FPos >= FText.size()) Fail("')' expected");
-        Value();
-      }
-      ++FPos;
-      FW.WriteListEnd();
+      ListValue();
     } else if (C == '<') {
-      Nest Guard(FDepth, *this);
-      ++FPos;
-      FW.WriteValue(vaCollection);
-      for (SkipSpace(); Peek() != '>'; SkipSpace()) {
-        if (FPos >= FText.size()) Fail("'>' expected");
-        String Item = Ident("'item' expected");
-        if (!SameText(Item, "item")) Fail("'item' expected");
-        SkipBlanks();
-        if (Peek() == '[') {
-          ++FPos;
-          SkipBlanks();
-          NumberValue();
-          Expect(']');
-        }
-        FW.WriteListBegin();
-        for (;;) {
-          SkipSpace();
-          String Id = DottedIdent("property or 'end' expected");
-          SkipBlanks();
-          if (Peek() != '=') {
-            if (!SameText(Id, "end")) Fail(Format("'=' expected after '%s'", Id));
-            break;
-          }
-          ++FPos;
-          FW.WriteStr(Id);
-          Value();
-        }
-        FW.WriteListEnd();
-      }
-      ++FPos;
-      FW.WriteListEnd();
+      CollectionValue();
     } else if (C == '{') {
-      ++FPos;
-      std::vector<std::uint8_t> Data;
-      for (;;) {
-        SkipSpace();
-        if (Peek() == '}') break;
-        int Hi = HexValue(Peek());
-        int Lo = FPos + 1 < FText.size() ? HexValue(FText[FPos + 1]) : -1;
-        if (Hi < 0 || Lo < 0) Fail("hexadecimal digits expected");
-        Data.push_back(static_cast<std::uint8_t>(Hi * 16 + Lo));
-        FPos += 2;
-      }
-      ++FPos;
-      FW.WriteValue(vaBinary);
-      std::uint32_t N = static_cast<std::uint32_t>(Data.size());
-      std::uint8_t L[4] = {static_cast<std::uint8_t>(N), static_cast<std::uint8_t>(N >> 8),
-                           static_cast<std::uint8_t>(N >> 16), static_cast<std::uint8_t>(N >> 24)};
-      FW.Write(L, 4);
-      FW.Write(Data.data(), static_cast<std::int64_t>(Data.size()));
+      BinaryValue();
     } else {
       Fail("value expected");
     }
+  }
+
+  /// A keyword value, or an identifier.
+  void IdentValue() {
+    String Id = DottedIdent("value expected");
+    if (SameText(Id, "True")) FW.WriteValue(vaTrue);
+    else if (SameText(Id, "False")) FW.WriteValue(vaFalse);
+    else if (SameText(Id, "nil")) FW.WriteValue(vaNil);
+    else if (SameText(Id, "null")) FW.WriteValue(vaVarNull);
+    else FW.WriteIdent(Id);
+  }
+
+  void SetValue() {
+    ++FPos;
+    FW.WriteValue(vaSet);
+    SkipSpace();
+    if (Peek() != ']') {
+      for (;;) {
+        SkipSpace();
+        FW.WriteStr(Ident("set element expected"));
+        SkipSpace();
+        if (Peek() == ']') break;
+        Expect(',');
+      }
+    }
+    ++FPos;
+    FW.WriteStr("");
+  }
+
+  void ListValue() {
+    Nest Guard(FDepth, *this);
+    ++FPos;
+    FW.WriteListBegin();
+    for (SkipSpace(); Peek() != ')'; SkipSpace()) {
+      if (FPos >= FText.size()) Fail("')' expected");
+      Value();
+    }
+    ++FPos;
+    FW.WriteListEnd();
+  }
+
+  void CollectionValue() {
+    Nest Guard(FDepth, *this);
+    ++FPos;
+    FW.WriteValue(vaCollection);
+    for (SkipSpace(); Peek() != '>'; SkipSpace()) {
+      if (FPos >= FText.size()) Fail("'>' expected");
+      String Item = Ident("'item' expected");
+      if (!SameText(Item, "item")) Fail("'item' expected");
+      SkipBlanks();
+      if (Peek() == '[') {
+        ++FPos;
+        SkipBlanks();
+        NumberValue();
+        Expect(']');
+      }
+      FW.WriteListBegin();
+      ItemProperties();
+      FW.WriteListEnd();
+    }
+    ++FPos;
+    FW.WriteListEnd();
+  }
+
+  /// The properties of a collection item, up to its "end".
+  void ItemProperties() {
+    for (;;) {
+      SkipSpace();
+      String Id = DottedIdent("property or 'end' expected");
+      SkipBlanks();
+      if (Peek() != '=') {
+        if (!SameText(Id, "end")) Fail(Format("'=' expected after '%s'", Id));
+        return;
+      }
+      ++FPos;
+      FW.WriteStr(Id);
+      Value();
+    }
+  }
+
+  void BinaryValue() {
+    ++FPos;
+    std::vector<std::uint8_t> Data;
+    for (;;) {
+      SkipSpace();
+      if (Peek() == '}') break;
+      int Hi = HexValue(Peek());
+      int Lo = FPos + 1 < FText.size() ? HexValue(FText[FPos + 1]) : -1;
+      if (Hi < 0 || Lo < 0) Fail("hexadecimal digits expected");
+      Data.push_back(static_cast<std::uint8_t>(Hi * 16 + Lo));
+      FPos += 2;
+    }
+    ++FPos;
+    FW.WriteValue(vaBinary);
+    std::uint32_t N = static_cast<std::uint32_t>(Data.size());
+    std::uint8_t L[4] = {static_cast<std::uint8_t>(N), static_cast<std::uint8_t>(N >> 8),
+                         static_cast<std::uint8_t>(N >> 16), static_cast<std::uint8_t>(N >> 24)};
+    FW.Write(L, 4);
+    FW.Write(Data.data(), static_cast<std::int64_t>(Data.size()));
   }
 
   std::string_view FText;

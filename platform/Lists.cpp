@@ -75,6 +75,33 @@ void TList::Move(int CurIndex, int NewIndex) {
 
 FK_IMPLEMENT(TStrings, "Classes") {}
 
+namespace {
+/// Runs `Change` inside one update of `Strings`, so that listeners hear of it once. The
+/// update ends however `Change` ends; a listener that fails at the end of a failed change
+/// cannot hide that failure, while after success its failure passes on.
+template <class F> void InOneUpdate(TStrings& Strings, F&& Change) {
+  Strings.BeginUpdate();
+  auto End = OnFailure([&Strings]() noexcept { RunIgnoringExceptions([&Strings] { Strings.EndUpdate(); }); });
+  Change();
+  End.Dismiss();
+  Strings.EndUpdate();
+}
+
+/// Gives `Strings` the delimiter, quote and blanks of comma text until the guard goes.
+[[nodiscard]] auto CommaSyntax(TStrings& Strings) {
+  auto Restore = Finally([&Strings, D = Strings.Delimiter, Q = Strings.QuoteChar,
+                          Strict = Strings.StrictDelimiter]() noexcept {
+    Strings.Delimiter = D;
+    Strings.QuoteChar = Q;
+    Strings.StrictDelimiter = Strict;
+  });
+  Strings.Delimiter = ',';
+  Strings.QuoteChar = '"';
+  Strings.StrictDelimiter = false;
+  return Restore;
+}
+} // namespace
+
 void TStrings::IndexError(int Index) const { throw EStringListError(SListIndexError, Index); }
 
 void TStrings::Put(int Index, const String& S) {
@@ -104,14 +131,9 @@ int TStrings::AddObject(const String& S, TObject* Obj) {
 }
 
 void TStrings::AddStrings(TStrings* Strings) {
-  BeginUpdate();
-  try {
+  InOneUpdate(*this, [&] {
     for (int I = 0; I < Strings->Count(); ++I) AddObject(Strings->Get(I), Strings->GetObject(I));
-  } catch (...) {
-    EndUpdate();
-    throw;
-  }
-  EndUpdate();
+  });
 }
 
 int TStrings::CompareStrings(const String& S1, const String& S2) const { return CompareText(S1, S2); }
@@ -160,8 +182,7 @@ void TStrings::Assign(TPersistent* Source) {
     inherited::Assign(Source);
     return;
   }
-  BeginUpdate();
-  try {
+  InOneUpdate(*this, [&] {
     Clear();
     NameValueSeparator = Other->NameValueSeparator;
     Delimiter = Other->Delimiter;
@@ -169,11 +190,7 @@ void TStrings::Assign(TPersistent* Source) {
     StrictDelimiter = Other->StrictDelimiter;
     LineBreak = Other->LineBreak;
     AddStrings(Other);
-  } catch (...) {
-    EndUpdate();
-    throw;
-  }
-  EndUpdate();
+  });
 }
 
 String TStrings::Names(int Index) const {
@@ -225,8 +242,7 @@ String TStrings::Text() const {
 }
 
 void TStrings::SetText(std::string_view Value) {
-  BeginUpdate();
-  try {
+  InOneUpdate(*this, [&] {
     Clear();
     size_t Start = 0;
     while (Start < Value.size()) {
@@ -239,11 +255,7 @@ void TStrings::SetText(std::string_view Value) {
       Start = End + 1;
       if (Value[End] == '\r' && Start < Value.size() && Value[Start] == '\n') ++Start;
     }
-  } catch (...) {
-    EndUpdate();
-    throw;
-  }
-  EndUpdate();
+  });
 }
 
 namespace {
@@ -263,6 +275,31 @@ String Quoted(const String& S, char Quote) {
   return Out;
 }
 bool IsBlank(char C) { return C != '\0' && static_cast<unsigned char>(C) <= ' '; }
+/// The item of delimited text that starts at `P`, quoted or plain; `P` moves past it.
+String NextDelimitedItem(std::string_view Value, size_t& P, char Delimiter, char Quote, bool Strict) {
+  const size_t N = Value.size();
+  String S;
+  if (Value[P] != Quote) {
+    size_t Begin = P;
+    while (P < N && Value[P] != Delimiter && (Strict || !IsBlank(Value[P]))) ++P;
+    S.assign(Value.substr(Begin, P - Begin));
+    return S;
+  }
+  ++P;
+  while (P < N) {
+    if (Value[P] == Quote) {
+      if (P + 1 < N && Value[P + 1] == Quote) {
+        S.push_back(Quote);
+        P += 2;
+        continue;
+      }
+      ++P;
+      break;
+    }
+    S.push_back(Value[P++]);
+  }
+  return S;
+}
 } // namespace
 
 String TStrings::DelimitedText() const {
@@ -278,8 +315,7 @@ String TStrings::DelimitedText() const {
 }
 
 void TStrings::SetDelimitedText(std::string_view Value) {
-  BeginUpdate();
-  try {
+  InOneUpdate(*this, [&] {
     Clear();
     size_t P = 0, N = Value.size();
     auto SkipBlanks = [&] {
@@ -288,27 +324,7 @@ void TStrings::SetDelimitedText(std::string_view Value) {
     };
     SkipBlanks();
     while (P < N) {
-      String S;
-      if (Value[P] == QuoteChar) {
-        ++P;
-        while (P < N) {
-          if (Value[P] == QuoteChar) {
-            if (P + 1 < N && Value[P + 1] == QuoteChar) {
-              S.push_back(QuoteChar);
-              P += 2;
-              continue;
-            }
-            ++P;
-            break;
-          }
-          S.push_back(Value[P++]);
-        }
-      } else {
-        size_t Begin = P;
-        while (P < N && Value[P] != Delimiter && (StrictDelimiter || !IsBlank(Value[P]))) ++P;
-        S.assign(Value.substr(Begin, P - Begin));
-      }
-      Add(S);
+      Add(NextDelimitedItem(Value, P, Delimiter, QuoteChar, StrictDelimiter));
       SkipBlanks();
       if (P < N && Value[P] == Delimiter) {
         if (P + 1 == N) Add("");
@@ -316,44 +332,18 @@ void TStrings::SetDelimitedText(std::string_view Value) {
         SkipBlanks();
       }
     }
-  } catch (...) {
-    EndUpdate();
-    throw;
-  }
-  EndUpdate();
+  });
 }
 
 String TStrings::CommaText() const {
-  auto* Self = const_cast<TStrings*>(this);
-  char D = Delimiter, Q = QuoteChar;
-  bool Strict = StrictDelimiter;
-  Self->Delimiter = ',';
-  Self->QuoteChar = '"';
-  Self->StrictDelimiter = false;
-  String Out = DelimitedText();
-  Self->Delimiter = D;
-  Self->QuoteChar = Q;
-  Self->StrictDelimiter = Strict;
-  return Out;
+  // The syntax is switched for the call and back: the list's own settings are untouched.
+  auto Syntax = CommaSyntax(*const_cast<TStrings*>(this));
+  return DelimitedText();
 }
 
 void TStrings::SetCommaText(std::string_view Value) {
-  char D = Delimiter, Q = QuoteChar;
-  bool Strict = StrictDelimiter;
-  Delimiter = ',';
-  QuoteChar = '"';
-  StrictDelimiter = false;
-  try {
-    SetDelimitedText(Value);
-  } catch (...) {
-    Delimiter = D;
-    QuoteChar = Q;
-    StrictDelimiter = Strict;
-    throw;
-  }
-  Delimiter = D;
-  QuoteChar = Q;
-  StrictDelimiter = Strict;
+  auto Syntax = CommaSyntax(*this);
+  SetDelimitedText(Value);
 }
 
 void TStrings::BeginUpdate() {

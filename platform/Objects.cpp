@@ -13,33 +13,32 @@ FK_RESOURCESTRING(SInvalidReclass, "Class %s does not descend from %s");
 //===----------------------------------------------------------------------===//
 
 TClassRec::TClassRec(TClass AParent, String AClassName, String AUnitName)
-    : Parent(AParent), ClassName(std::move(AClassName)), UnitName(std::move(AUnitName)) {
-  auto* Info = new TTypeInfo;
-  Info->Kind = tkClass;
-  Info->Name = ClassName;
-  Info->Data.ClassRef = this;
-  Info->Data.IntfUnit = UnitName;
-  FTypeInfo = Info;
+    : Parent(AParent), ClassName(std::move(AClassName)), UnitName(std::move(AUnitName)),
+      FTypeInfo(std::make_unique<TTypeInfo>()) {
+  FTypeInfo->Kind = tkClass;
+  FTypeInfo->Name = ClassName;
+  FTypeInfo->Data.ClassRef = this;
+  FTypeInfo->Data.IntfUnit = UnitName;
 }
 
-TClassRec::~TClassRec() {
-  for (TPropInfo* P : FOwnProps) delete P;
-  delete FTypeInfo;
-}
+TClassRec::~TClassRec() = default;
 
-void TClassRec::AddOwnProperty(TPropInfo* Prop) { FOwnProps.push_back(Prop); }
+TPropInfo* TClassRec::AddOwnProperty(std::unique_ptr<TPropInfo> Prop) {
+  FOwnProps.push_back(std::move(Prop));
+  return FOwnProps.back().get();
+}
 
 void TClassRec::FinishProperties() {
   FProps = Parent ? Parent->FProps : std::vector<PPropInfo>{};
-  for (TPropInfo* Own : FOwnProps) {
+  for (const std::unique_ptr<TPropInfo>& Own : FOwnProps) {
     auto Same = std::find_if(FProps.begin(), FProps.end(),
                              [&](PPropInfo P) { return SameText(P->Name, Own->Name); });
-    if (Same != FProps.end()) *Same = Own; // a redeclaration hides the parent's property
-    else FProps.push_back(Own);
+    if (Same != FProps.end()) *Same = Own.get(); // a redeclaration hides the parent's property
+    else FProps.push_back(Own.get());
   }
-  for (size_t I = 0; I < FOwnProps.size(); ++I) {
-    auto Pos = std::find(FProps.begin(), FProps.end(), FOwnProps[I]);
-    FOwnProps[I]->NameIndex = static_cast<int>(Pos - FProps.begin());
+  for (const std::unique_ptr<TPropInfo>& Own : FOwnProps) {
+    auto Pos = std::find(FProps.begin(), FProps.end(), Own.get());
+    Own->NameIndex = static_cast<int>(Pos - FProps.begin());
   }
   FSorted = FProps;
   std::stable_sort(FSorted.begin(), FSorted.end(),
@@ -119,8 +118,8 @@ TObject* TClassRec::NewInstance() {
   return Obj;
 }
 
-TClass TClassRec::NewGeneratedClass(TClass AParent, String AClassName, String AUnitName) {
-  auto* Rec = new TClassRec(AParent, std::move(AClassName), std::move(AUnitName));
+TGeneratedClass TClassRec::NewGeneratedClass(TClass AParent, String AClassName, String AUnitName) {
+  TGeneratedClass Rec(new TClassRec(AParent, std::move(AClassName), std::move(AUnitName)));
   Rec->Generated = true;
   Rec->Compiled = AParent->Compiled;
   Rec->Factory = AParent->Factory;

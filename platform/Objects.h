@@ -18,6 +18,7 @@
 #include "platform/Interfaces.h"
 
 #include <functional>
+#include <memory>
 #include <vector>
 
 namespace formkit {
@@ -26,6 +27,10 @@ class TObject;
 class TComponent;
 class TClassRec;
 struct TPropInfo;
+struct TGeneratedClassDeleter;
+/// The owner of a class record made at run time (`TClassRec::NewGeneratedClass`): frees
+/// the record when it goes.
+using TGeneratedClass = std::unique_ptr<TClassRec, TGeneratedClassDeleter>;
 using PPropInfo = const TPropInfo*;
 /// A class reference: the record of a class. Compiled records are immortal.
 using TClass = TClassRec*;
@@ -62,7 +67,7 @@ struct TMethodEntry {
 
 /// The run-time description of a class. Compiled records are built on first use,
 /// parents first, and never freed; generated records are made at run time on a
-/// compiled parent and freed by their maker with `DisposeGeneratedClass`.
+/// compiled parent and freed by the `TGeneratedClass` that their maker holds.
 class FK_API TClassRec {
 public:
   /// The parent class, or null for `TObject`.
@@ -76,7 +81,7 @@ public:
   TObject* (*Factory)() = nullptr;
 
   /// The type information of the class (kind `tkClass`).
-  PTypeInfo TypeInfo() const noexcept { return FTypeInfo; }
+  PTypeInfo TypeInfo() const noexcept { return FTypeInfo.get(); }
   /// Published properties, ancestors' first, in declaration order.
   const std::vector<PPropInfo>& Properties() const noexcept { return FProps; }
   /// Published properties sorted by name without regard to case. Computed once.
@@ -106,29 +111,40 @@ public:
   /// hash of the folded name, then one comparison with the candidate.
   PPropInfo FindProperty(std::string_view Name) const noexcept;
   /// Allocates an instance without running any constructor logic; the instance's
-  /// record is this one. Raises `EInvalidOperation` for an abstract class.
-  TObject* NewInstance();
+  /// record is this one. The caller runs the constructor (`RunConstructor`) or destroys
+  /// the instance. Raises `EInvalidOperation` for an abstract class.
+  [[nodiscard]] TObject* NewInstance();
 
   /// Makes a record at run time on a compiled or generated parent, sharing its
-  /// properties and factory, with its own names and an empty method table.
-  static TClass NewGeneratedClass(TClass Parent, String ClassName, String UnitName);
+  /// properties and factory, with its own names and an empty method table. The record
+  /// lives as long as the owner returned; instances must be gone or re-classed by then.
+  [[nodiscard]] static TGeneratedClass NewGeneratedClass(TClass Parent, String ClassName, String UnitName);
   /// Frees a record made by `NewGeneratedClass`; instances must be gone or re-classed.
+  /// Does nothing for a compiled record. The owner of a generated record calls it.
   static void DisposeGeneratedClass(TClass Class) noexcept;
 
   // Used while a compiled record is built; see `TClassBuilder`.
   TClassRec(TClass Parent, String ClassName, String UnitName);
-  void AddOwnProperty(TPropInfo* Prop);
+  TClassRec(const TClassRec&) = delete;
+  TClassRec& operator=(const TClassRec&) = delete;
+  /// Adopts a property this class declares; returns it for refinement.
+  TPropInfo* AddOwnProperty(std::unique_ptr<TPropInfo> Prop);
   void FinishProperties();
   ~TClassRec();
 
 private:
-  TTypeInfo* FTypeInfo = nullptr;
-  std::vector<TPropInfo*> FOwnProps; // owned
+  std::unique_ptr<TTypeInfo> FTypeInfo;
+  std::vector<std::unique_ptr<TPropInfo>> FOwnProps;
   std::vector<PPropInfo> FProps;
   std::vector<PPropInfo> FSorted;
   /// `FProps` by folded-name hash: open addressing, a power of two in size, empty slots null.
   std::vector<std::pair<std::uint64_t, PPropInfo>> FByName;
   void IndexPropertiesByName();
+};
+
+/// How `TGeneratedClass` frees its record: `TClassRec::DisposeGeneratedClass`.
+struct TGeneratedClassDeleter {
+  void operator()(TClass Class) const noexcept { TClassRec::DisposeGeneratedClass(Class); }
 };
 
 //===----------------------------------------------------------------------===//
@@ -248,19 +264,46 @@ template <class T> void FreeAndNil(T*& Obj) {
   }
 }
 
-/// Calls `Destroy` on scope exit; for plain objects owned by one function.
-template <class T> class TObjectGuard {
+/// The owner of one plain object: calls `Destroy` on what it holds when it goes or takes
+/// another. Movable, so a function can hand a new object to its caller, and a list of
+/// guards is a list that owns its objects. Not for counted or owned components: their
+/// references or their owner free them.
+///
+/// Example:
+///   TObjectGuard<TMemoryStream> Data(new TMemoryStream);
+///   Fill(Data.Get());
+///   std::vector<TObjectGuard<TMonitor>> Monitors;   // each monitor goes with the list
+template <class T> class [[nodiscard]] TObjectGuard {
 public:
+  TObjectGuard() noexcept = default;
   explicit TObjectGuard(T* Obj) noexcept : FObj(Obj) {}
-  ~TObjectGuard() { FreeAndNil(FObj); }
+  TObjectGuard(TObjectGuard&& Other) noexcept : FObj(Other.Release()) {}
+  /// Takes over a guard of a descendant class.
+  template <class U>
+    requires std::is_convertible_v<U*, T*>
+  TObjectGuard(TObjectGuard<U>&& Other) noexcept : FObj(Other.Release()) {}
+  /// Frees what this guard held, then takes what `Other` held.
+  TObjectGuard& operator=(TObjectGuard&& Other) noexcept {
+    Reset(Other.Release());
+    return *this;
+  }
   TObjectGuard(const TObjectGuard&) = delete;
   TObjectGuard& operator=(const TObjectGuard&) = delete;
+  ~TObjectGuard() { Reset(); }
+
   T* Get() const noexcept { return FObj; }
   T* operator->() const noexcept { return FObj; }
-  T* Release() noexcept { return std::exchange(FObj, nullptr); }
+  explicit operator bool() const noexcept { return FObj != nullptr; }
+  /// Hands the object over to the caller, who frees it from now on.
+  [[nodiscard]] T* Release() noexcept { return std::exchange(FObj, nullptr); }
+  /// Frees the object held (cleared first, so the teardown sees an empty guard) and
+  /// holds `Obj` instead.
+  void Reset(T* Obj = nullptr) noexcept {
+    if (T* Old = std::exchange(FObj, Obj)) Old->Destroy();
+  }
 
 private:
-  T* FObj;
+  T* FObj = nullptr;
 };
 
 //===----------------------------------------------------------------------===//

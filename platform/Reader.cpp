@@ -43,6 +43,10 @@ struct TLoadedEntry {
   TComponent* OldParent = nullptr;
 };
 
+} // namespace detail
+
+namespace {
+/// A reference read into a property, resolved when the read's references are fixed up.
 struct TFixup {
   TPersistent* Instance;
   TComponent* Holder;
@@ -50,13 +54,14 @@ struct TFixup {
   String Name;
   TComponent* LookupRoot;
 };
+} // namespace
 
+namespace detail {
 /// What a reader collects between `BeginReferences` and `EndReferences`.
 struct TReaderState {
   std::vector<TLoadedEntry> Loaded;
   std::vector<TFixup> Fixups;
 };
-
 } // namespace detail
 
 namespace {
@@ -128,11 +133,8 @@ TReader::~TReader() = default;
 
 void TReader::BeforeDestruction() {
   // Give back what was buffered but not consumed, so the stream stands right after
-  // the data that was read.
-  try {
-    if (FStream && FBufEnd > FBufPos) FlushBuffer();
-  } catch (...) {
-  }
+  // the data that was read. A stream that refuses cannot be reported from a teardown.
+  if (FStream && FBufEnd > FBufPos) RunIgnoringExceptions([this] { FlushBuffer(); });
   FState.reset();
   inherited::BeforeDestruction();
 }
@@ -479,6 +481,79 @@ void TReader::ReadProperty(TPersistent* Instance) {
   }
 }
 
+namespace {
+/// An integer or character property: the value must lie in the type's range.
+void ReadIntegerValue(TReader& R, TPersistent* Instance, PPropInfo Prop, PTypeInfo Type) {
+  std::int64_t V = R.ReadInt64();
+  if (V < Type->Data.MinValue || V > Type->Data.MaxValue) throw EReadError(SInvalidPropertyValue);
+  SetOrdProp(Instance, Prop, V);
+}
+
+/// An enumeration property: a name of the type, or True or False for a Boolean.
+void ReadEnumValue(TReader& R, TPersistent* Instance, PPropInfo Prop, PTypeInfo Type) {
+  TValueType T = R.NextValue();
+  int V;
+  if (T == vaFalse || T == vaTrue) V = R.ReadBoolean() ? 1 : 0;
+  else V = GetEnumValue(Type, R.ReadIdent());
+  PTypeInfo Base = Type->Data.BaseType ? Type->Data.BaseType() : Type;
+  if (V < 0 || V >= static_cast<int>(Base->Data.EnumNames.size())) throw EReadError(SInvalidPropertyValue);
+  SetOrdProp(Instance, Prop, V);
+}
+
+/// A set property: the names of its elements, up to an empty one.
+void ReadSetValue(TReader& R, TPersistent* Instance, PPropInfo Prop, PTypeInfo Type) {
+  TValueType T = R.ReadValue();
+  if (T != vaSet) BadValue(T);
+  PTypeInfo Comp = Type->Data.CompType ? Type->Data.CompType() : nullptr;
+  std::uint64_t Mask = 0;
+  for (String Element = R.ReadStr(); !Element.empty(); Element = R.ReadStr()) {
+    int V = Comp ? GetEnumValue(Comp, Element) : -1;
+    if (V < 0 || V > 63) throw EReadError(SInvalidPropertyValue);
+    Mask |= std::uint64_t(1) << V;
+  }
+  SetOrdProp(Instance, Prop, static_cast<std::int64_t>(Mask));
+}
+
+/// A method property: nil, or the name of a method of the root being read.
+void ReadMethodValue(TReader& R, TPersistent* Instance, PPropInfo Prop) {
+  TValueType T = R.NextValue();
+  if (T == vaNil) {
+    R.ReadValue();
+    SetMethodProp(Instance, Prop, TMethod{});
+    return;
+  }
+  if (T != vaIdent) {
+    R.ReadValue();
+    BadValue(T);
+  }
+  String Name = R.ReadIdent();
+  void* Code = R.FindMethod(R.Root(), Name);
+  SetMethodProp(Instance, Prop, TMethod{Code, static_cast<TObject*>(R.Root())});
+}
+} // namespace
+
+void TReader::ReadObjectValue(TPersistent* Instance, PPropInfo Prop, TTypeKind Kind) {
+  TValueType T = ReadValue();
+  if (T == vaNil) {
+    if (!Prop->IsWritable()) throw EReadError(SReadOnlyProperty, Prop->Name);
+    if (Kind == tkClass) SetOrdProp(Instance, Prop, 0);
+    else SetInterfaceProp(Instance, Prop, nullptr);
+  } else if (T == vaIdent) {
+    String Name = ReadStr();
+    TClass PropClass = Kind == tkClass ? GetObjectPropClass(Prop) : nullptr;
+    bool IsComponentClass = Kind == tkInterface || (PropClass && PropClass->InheritsFrom(TComponent::StaticClass()));
+    if (!Prop->IsWritable() || !IsComponentClass || Name.empty()) throw EReadError(SInvalidPropertyValue);
+    if (!FState) throw EReadError(SInvalidPropertyValue);
+    FState->Fixups.push_back({Instance, FCurrent, Prop, Name, FLookupRoot});
+  } else if (T == vaCollection && Kind == tkClass) {
+    auto* Coll = dynamic_cast<TCollection*>(GetObjectProp(Instance, Prop));
+    if (!Coll) throw EReadError(SInvalidPropertyValue);
+    ReadCollection(Coll);
+  } else {
+    BadValue(T);
+  }
+}
+
 void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
   PTypeInfo Type = Prop->PropType();
   TTypeKind Kind = Type->Kind;
@@ -486,35 +561,9 @@ void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
   switch (Kind) {
   case tkInteger:
   case tkChar:
-  case tkWChar: {
-    std::int64_t V = ReadInt64();
-    if (V < Type->Data.MinValue || V > Type->Data.MaxValue) throw EReadError(SInvalidPropertyValue);
-    SetOrdProp(Instance, Prop, V);
-    break;
-  }
-  case tkEnumeration: {
-    TValueType T = NextValue();
-    int V;
-    if (T == vaFalse || T == vaTrue) V = ReadBoolean() ? 1 : 0;
-    else V = GetEnumValue(Type, ReadIdent());
-    PTypeInfo Base = Type->Data.BaseType ? Type->Data.BaseType() : Type;
-    if (V < 0 || V >= static_cast<int>(Base->Data.EnumNames.size())) throw EReadError(SInvalidPropertyValue);
-    SetOrdProp(Instance, Prop, V);
-    break;
-  }
-  case tkSet: {
-    TValueType T = ReadValue();
-    if (T != vaSet) BadValue(T);
-    PTypeInfo Comp = Type->Data.CompType ? Type->Data.CompType() : nullptr;
-    std::uint64_t Mask = 0;
-    for (String Element = ReadStr(); !Element.empty(); Element = ReadStr()) {
-      int V = Comp ? GetEnumValue(Comp, Element) : -1;
-      if (V < 0 || V > 63) throw EReadError(SInvalidPropertyValue);
-      Mask |= std::uint64_t(1) << V;
-    }
-    SetOrdProp(Instance, Prop, static_cast<std::int64_t>(Mask));
-    break;
-  }
+  case tkWChar: ReadIntegerValue(*this, Instance, Prop, Type); break;
+  case tkEnumeration: ReadEnumValue(*this, Instance, Prop, Type); break;
+  case tkSet: ReadSetValue(*this, Instance, Prop, Type); break;
   case tkInt64: SetInt64Prop(Instance, Prop, ReadInt64()); break;
   case tkFloat: SetFloatProp(Instance, Prop, ReadFloat()); break;
   case tkString:
@@ -522,45 +571,9 @@ void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
   case tkWString:
   case tkUString: SetStrProp(Instance, Prop, ReadString()); break;
   case tkVariant: SetVariantProp(Instance, Prop, ReadVariant()); break;
-  case tkMethod: {
-    TValueType T = NextValue();
-    if (T == vaNil) {
-      ReadValue();
-      SetMethodProp(Instance, Prop, TMethod{});
-      break;
-    }
-    if (T != vaIdent) {
-      ReadValue();
-      BadValue(T);
-    }
-    String Name = ReadIdent();
-    void* Code = FindMethod(FRoot, Name);
-    SetMethodProp(Instance, Prop, TMethod{Code, static_cast<TObject*>(FRoot)});
-    break;
-  }
+  case tkMethod: ReadMethodValue(*this, Instance, Prop); break;
   case tkClass:
-  case tkInterface: {
-    TValueType T = ReadValue();
-    if (T == vaNil) {
-      if (!Prop->IsWritable()) throw EReadError(SReadOnlyProperty, Prop->Name);
-      if (Kind == tkClass) SetOrdProp(Instance, Prop, 0);
-      else SetInterfaceProp(Instance, Prop, nullptr);
-    } else if (T == vaIdent) {
-      String Name = ReadStr();
-      TClass PropClass = Kind == tkClass ? GetObjectPropClass(Prop) : nullptr;
-      bool IsComponentClass = Kind == tkInterface || (PropClass && PropClass->InheritsFrom(TComponent::StaticClass()));
-      if (!Prop->IsWritable() || !IsComponentClass || Name.empty()) throw EReadError(SInvalidPropertyValue);
-      if (!FState) throw EReadError(SInvalidPropertyValue);
-      FState->Fixups.push_back({Instance, FCurrent, Prop, Name, FLookupRoot});
-    } else if (T == vaCollection && Kind == tkClass) {
-      auto* Coll = dynamic_cast<TCollection*>(GetObjectProp(Instance, Prop));
-      if (!Coll) throw EReadError(SInvalidPropertyValue);
-      ReadCollection(Coll);
-    } else {
-      BadValue(T);
-    }
-    break;
-  }
+  case tkInterface: ReadObjectValue(Instance, Prop, Kind); break;
   default: throw EReadError(SInvalidPropertyValue);
   }
 }
@@ -568,7 +581,9 @@ void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
 void TReader::ReadCollection(TCollection* Collection) {
   TNestingGuard G(FNesting);
   Collection->BeginUpdate();
-  auto End = Finally([&]() noexcept { Collection->EndUpdate(); });
+  // Ending the update tells the collection's owner, which may fail: after a failure here
+  // that one passes on, after success its own does.
+  auto End = OnFailure([Collection]() noexcept { RunIgnoringExceptions([Collection] { Collection->EndUpdate(); }); });
   // The items go: references read into them earlier (the property came twice) must not
   // be written into freed items.
   if (Collection->Count() > 0) ForgetFixupsInto(Collection);
@@ -581,6 +596,8 @@ void TReader::ReadCollection(TCollection* Collection) {
     ReadListEnd();
   }
   ReadListEnd();
+  End.Dismiss();
+  Collection->EndUpdate();
 }
 
 namespace {
@@ -598,7 +615,7 @@ void TReader::ForgetFixupsInto(TCollection* Collection) {
   std::size_t First = Fixups.size();
   while (First > 0 && Fixups[First - 1].Holder == FCurrent) --First;
   auto Gone = std::remove_if(Fixups.begin() + static_cast<std::ptrdiff_t>(First), Fixups.end(),
-                             [&](const detail::TFixup& F) { return IsWithin(F.Instance, Collection); });
+                             [&](const TFixup& F) { return IsWithin(F.Instance, Collection); });
   Fixups.erase(Gone, Fixups.end());
 }
 
@@ -630,13 +647,21 @@ void TReader::BeginReferences() {
   if (!FState) FState = std::make_unique<detail::TReaderState>();
 }
 
-void TReader::EndReferences() { FState.reset(); }
+void TReader::EndReferences() noexcept { FState.reset(); }
+
+void TReader::ClearLoadingFlags() noexcept {
+  if (!FState) return;
+  for (const detail::TLoadedEntry& E : FState->Loaded) {
+    E.Component->SetReading(false);
+    E.Component->SetLoading(false);
+  }
+}
 
 void TReader::DoFixupReferences() {
   if (!FState) return;
-  std::vector<detail::TFixup> Fixups = std::move(FState->Fixups);
+  std::vector<TFixup> Fixups = std::move(FState->Fixups);
   FState->Fixups.clear();
-  for (const detail::TFixup& F : Fixups) {
+  for (const TFixup& F : Fixups) {
     String Name = F.Name;
     if (OnReferenceName) OnReferenceName(this, Name);
     TComponent* Target = detail::FindReference(F.LookupRoot, Name);
@@ -689,7 +714,7 @@ void TReader::DropCreatedAfter(std::size_t LoadedIndex) noexcept {
   }
   Loaded.resize(LoadedIndex);
   std::unordered_set<TComponent*> GoneSet(Gone.begin(), Gone.end());
-  std::erase_if(FState->Fixups, [&](const detail::TFixup& F) { return GoneSet.count(F.Holder) != 0; });
+  std::erase_if(FState->Fixups, [&](const TFixup& F) { return GoneSet.count(F.Holder) != 0; });
   // Last created first: children before their parents and owners.
   FreeComponentsTogether(Gone);
 }
@@ -703,10 +728,7 @@ void TReader::RestoreParent(const detail::TLoadedEntry& E) noexcept {
     // The component had that parent before the read: taking it back cannot be refused.
     // Should a framework refuse anyway, leave it without one rather than with a parent
     // that is about to go.
-    try {
-      C->SetParentComponent(nullptr);
-    } catch (...) {
-    }
+    RunIgnoringExceptions([C] { C->SetParentComponent(nullptr); });
   }
 }
 
@@ -716,45 +738,31 @@ void TReader::ReadData(TComponent* Instance) {
     return;
   }
   BeginReferences();
-  try {
-    ReadDataInner(Instance);
-    DoFixupReferences();
-  } catch (...) {
-    EndReferences();
-    throw;
-  }
-  EndReferences();
+  auto End = Finally([this]() noexcept { EndReferences(); });
+  ReadDataInner(Instance);
+  DoFixupReferences();
 }
 
 void TReader::ReadDataInner(TComponent* Instance) {
   TNestingGuard G(FNesting);
-  TComponent* OldCurrent = FCurrent;
-  TComponent* OldParent = FParent;
-  TComponent* OldOwner = FOwner;
-  TComponent* OldLookupRoot = FLookupRoot;
-  auto Restore = [&] {
+  auto Restore = Finally([this, OldCurrent = FCurrent, OldParent = FParent, OldOwner = FOwner,
+                          OldLookupRoot = FLookupRoot]() noexcept {
     FCurrent = OldCurrent;
     FParent = OldParent;
     FOwner = OldOwner;
     FLookupRoot = OldLookupRoot;
-  };
-  try {
-    FCurrent = Instance;
-    while (!EndOfList()) ReadProperty(Instance);
-    ReadListEnd();
-    FParent = Instance;
-    // The components of a nested root belong to it and are found under it by name.
-    if (Instance != FRoot && Instance->ComponentState().Contains(csInline)) {
-      FOwner = Instance;
-      FLookupRoot = Instance;
-    }
-    while (!EndOfList()) ReadComponent(nullptr);
-    ReadListEnd();
-  } catch (...) {
-    Restore();
-    throw;
+  });
+  FCurrent = Instance;
+  while (!EndOfList()) ReadProperty(Instance);
+  ReadListEnd();
+  FParent = Instance;
+  // The components of a nested root belong to it and are found under it by name.
+  if (Instance != FRoot && Instance->ComponentState().Contains(csInline)) {
+    FOwner = Instance;
+    FLookupRoot = Instance;
   }
-  Restore();
+  while (!EndOfList()) ReadComponent(nullptr);
+  ReadListEnd();
 }
 
 TComponent* TReader::ReadComponent(TComponent* Component) {
@@ -768,6 +776,9 @@ TComponent* TReader::ReadComponent(TComponent* Component) {
   std::size_t LoadedIndex = FState->Loaded.size();
   TComponent* Result = Component;
   try {
+    // Whatever went wrong, what this component brought goes before the failure is
+    // offered to the handler.
+    auto Drop = OnFailure([this, LoadedIndex]() noexcept { DropCreatedAfter(LoadedIndex); });
     if (Result) {
       FState->Loaded.push_back({Result, false});
     } else if (Flags.Contains(ffInherited)) {
@@ -803,10 +814,8 @@ TComponent* TReader::ReadComponent(TComponent* Component) {
     Result->SetReading(false);
     if (Flags.Contains(ffChildPos) && FParent) FParent->SetChildOrder(Result, ChildPos);
   } catch (const EAbort&) {
-    DropCreatedAfter(LoadedIndex);
     throw;
   } catch (const Exception& E) {
-    DropCreatedAfter(LoadedIndex);
     if (FErrorRefused) throw;
     if (!Error(E.Message())) {
       FErrorRefused = true;
@@ -839,6 +848,15 @@ TComponent* TReader::ReadRootComponent(TComponent* ARoot) {
   }
   bool OwnReferences = !FState;
   try {
+    auto Undo = OnFailure([this, ARoot, OwnReferences, CreatedRoot]() noexcept {
+      RemoveFixupReferences(ARoot, "");
+      ClearLoadingFlags();
+      if (OwnReferences) EndReferences();
+      if (CreatedRoot) {
+        SetRoot(nullptr);
+        ARoot->Destroy();
+      }
+    });
     if (ARoot->Name().empty() && !Name.empty()) {
       if (!IsValidIdent(Name)) throw EReadError(SInvalidComponentName, Name);
       ARoot->ChangeName(Name);
@@ -863,18 +881,6 @@ TComponent* TReader::ReadRootComponent(TComponent* ARoot) {
     }
     GlobalFixupReferences();
   } catch (...) {
-    RemoveFixupReferences(ARoot, "");
-    if (FState) {
-      for (const detail::TLoadedEntry& E : FState->Loaded) {
-        E.Component->SetReading(false);
-        E.Component->SetLoading(false);
-      }
-    }
-    if (OwnReferences) EndReferences();
-    if (CreatedRoot) {
-      SetRoot(nullptr);
-      ARoot->Destroy();
-    }
     RaiseAsReadError();
   }
   return ARoot;
@@ -888,6 +894,11 @@ void TReader::ReadComponents(TComponent* AOwner, TComponent* AParent, const TRea
   bool OwnReferences = !FState;
   BeginReferences();
   try {
+    auto End = Finally([this, OwnReferences]() noexcept {
+      if (OwnReferences) EndReferences();
+    });
+    // What was read stays, without the references that were still open.
+    auto Unflag = OnFailure([this]() noexcept { ClearLoadingFlags(); });
     while (!EndOfList()) {
       ReadSignature();
       TComponent* C = ReadComponent(nullptr);
@@ -896,17 +907,8 @@ void TReader::ReadComponents(TComponent* AOwner, TComponent* AParent, const TRea
     ReadListEnd();
     FixupReferences();
   } catch (...) {
-    // What was read stays, without the references that were still open.
-    if (FState) {
-      for (const detail::TLoadedEntry& E : FState->Loaded) {
-        E.Component->SetReading(false);
-        E.Component->SetLoading(false);
-      }
-    }
-    if (OwnReferences) EndReferences();
     RaiseAsReadError();
   }
-  if (OwnReferences) EndReferences();
 }
 
 } // namespace formkit

@@ -3,11 +3,13 @@
 // The one scope guard of the library: `Finally` runs its cleanup whenever the
 // scope ends; `OnFailure` runs it only when the scope is left by an exception,
 // for "undo what was done if the rest fails". Either can be dismissed once the
-// work is committed. Cleanups must not throw.
+// work is committed. Cleanups must not throw: a step that may fail (it notifies
+// listeners) goes through `RunIgnoringExceptions` on the way out of a failure.
 //
 // Example:
-//   Collection->BeginUpdate();
-//   auto End = Finally([&]() noexcept { Collection->EndUpdate(); });
+//   FAligning = true;
+//   auto Done = Finally([this]() noexcept { FAligning = false; });
+//   AlignControls();         // however this ends, the flag goes down again
 //
 //   List.push_back(Item);
 //   auto Undo = OnFailure([&]() noexcept { List.pop_back(); });
@@ -54,6 +56,26 @@ template <class Fn> [[nodiscard]] auto Finally(Fn&& F) {
 /// A guard that runs `F` only when the scope is left by an exception.
 template <class Fn> [[nodiscard]] auto OnFailure(Fn&& F) {
   return TScopeGuard<std::decay_t<Fn>, false>(std::forward<Fn>(F));
+}
+
+/// Runs `F` and drops whatever it throws, for a step whose failure cannot be reported: in
+/// a teardown, or in an `OnFailure` cleanup that notifies or lays out (ending an update,
+/// a selection batch), where a second exception could only replace the first, the one
+/// to report. For such a cleanup the scope dismisses the guard once the work succeeded
+/// and takes the step itself, so that a failure there passes on.
+///
+/// Example:
+///   Strings->BeginUpdate();
+///   auto End = OnFailure([&]() noexcept { RunIgnoringExceptions([&] { Strings->EndUpdate(); }); });
+///   Strings->Add(Line);
+///   End.Dismiss();
+///   Strings->EndUpdate();   // listeners hear here; what they throw passes on
+template <class Fn> void RunIgnoringExceptions(Fn&& F) noexcept {
+  try {
+    std::forward<Fn>(F)();
+  } catch (...) {
+    // Dropped on purpose: see above.
+  }
 }
 
 } // namespace formkit

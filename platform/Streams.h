@@ -49,9 +49,9 @@ class FK_API TStream : public TObject {
   FK_CLASS(TStream, TObject)
 
   /// Reads up to `Count` bytes; returns how many were read (0 at the end).
-  virtual std::int64_t Read(void* Buffer, std::int64_t Count) = 0;
+  [[nodiscard]] virtual std::int64_t Read(void* Buffer, std::int64_t Count) = 0;
   /// Writes up to `Count` bytes; returns how many were written.
-  virtual std::int64_t Write(const void* Buffer, std::int64_t Count) = 0;
+  [[nodiscard]] virtual std::int64_t Write(const void* Buffer, std::int64_t Count) = 0;
   /// Moves the position; returns the new position.
   virtual std::int64_t Seek(std::int64_t Offset, TSeekOrigin Origin) = 0;
   /// Sets the size; the position is clipped to it. Raises `EStreamError` when the
@@ -93,8 +93,8 @@ class FK_API TStream : public TObject {
 class FK_API TMemoryStream : public TStream {
   FK_CLASS(TMemoryStream, TStream)
 
-  std::int64_t Read(void* Buffer, std::int64_t Count) override;
-  std::int64_t Write(const void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Read(void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Write(const void* Buffer, std::int64_t Count) override;
   std::int64_t Seek(std::int64_t Offset, TSeekOrigin Origin) override;
   void SetSize64(std::int64_t NewSize) override;
   std::int64_t Size() override { return static_cast<std::int64_t>(FData.size()); }
@@ -148,8 +148,8 @@ class FK_API TFileStream : public TStream {
   FK_CLASS(TFileStream, TStream)
 
   TFileStream(const String& FileName, std::uint16_t Mode);
-  std::int64_t Read(void* Buffer, std::int64_t Count) override;
-  std::int64_t Write(const void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Read(void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Write(const void* Buffer, std::int64_t Count) override;
   std::int64_t Seek(std::int64_t Offset, TSeekOrigin Origin) override;
   void SetSize64(std::int64_t NewSize) override;
   const String& FileName() const noexcept { return FFileName; }
@@ -169,9 +169,9 @@ private:
 struct FK_API IStream : IInterface {
   FK_INTERFACE(IStream, IInterface, "{6F1C2B7A-3E4D-4C59-8A0B-2D7E91C4F513}")
   /// Reads up to `Count` bytes; returns how many were read.
-  virtual std::int64_t Read(void* Buffer, std::int64_t Count) = 0;
+  [[nodiscard]] virtual std::int64_t Read(void* Buffer, std::int64_t Count) = 0;
   /// Writes up to `Count` bytes; returns how many were written.
-  virtual std::int64_t Write(const void* Buffer, std::int64_t Count) = 0;
+  [[nodiscard]] virtual std::int64_t Write(const void* Buffer, std::int64_t Count) = 0;
   /// Moves the position; returns the new one.
   virtual std::int64_t Seek(std::int64_t Offset, int Origin) = 0;
   virtual void SetSize(std::int64_t NewSize) = 0;
@@ -186,8 +186,8 @@ class FK_API TStreamAdapter : public TInterfacedObject, public IStream {
   FK_INTERFACES(IStream)
 
   TStreamAdapter(TStream* Stream, TStreamOwnership Ownership = soReference);
-  std::int64_t Read(void* Buffer, std::int64_t Count) override;
-  std::int64_t Write(const void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Read(void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Write(const void* Buffer, std::int64_t Count) override;
   std::int64_t Seek(std::int64_t Offset, int Origin) override;
   /// Forwards to `SetSize64`.
   void SetSize(std::int64_t NewSize) override;
@@ -205,8 +205,8 @@ class FK_API TOleStream : public TStream {
   FK_CLASS(TOleStream, TStream)
 
   explicit TOleStream(IPtr<IStream> Stream);
-  std::int64_t Read(void* Buffer, std::int64_t Count) override;
-  std::int64_t Write(const void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Read(void* Buffer, std::int64_t Count) override;
+  [[nodiscard]] std::int64_t Write(const void* Buffer, std::int64_t Count) override;
   std::int64_t Seek(std::int64_t Offset, TSeekOrigin Origin) override;
   void SetSize64(std::int64_t NewSize) override;
   const IPtr<IStream>& HostStream() const noexcept { return FStream; }

@@ -164,17 +164,151 @@ String ThousandsSeparated(String Digits) {
   return Digits;
 }
 
+/// The arguments of one `Format` call, handed out in order; running out is an error of
+/// the format.
+class TArgCursor {
+public:
+  TArgCursor(std::string_view Fmt, std::initializer_list<TFormatArg> Args)
+      : FFmt(Fmt), FNext(Args.begin()), FEnd(Args.end()) {}
+  const TFormatArg& Next() {
+    if (FNext == FEnd) FormatError(FFmt);
+    return *FNext++;
+  }
+
+private:
+  std::string_view FFmt;
+  const TFormatArg* FNext;
+  const TFormatArg* FEnd;
+};
+
+/// What follows a `%`: left alignment, width, precision (-1 for none) and the
+/// conversion letter in lower case.
+struct TConversion {
+  bool Left = false;
+  int Width = 0;
+  int Prec = -1;
+  char Letter = 0;
+};
+
+/// A width or precision at `I`: digits, or `*` for the next argument, an integer.
+void ReadNumber(std::string_view Fmt, size_t& I, TArgCursor& Args, int& Value) {
+  if (I < Fmt.size() && Fmt[I] == '*') {
+    const TFormatArg& A = Args.Next();
+    if (A.K != TFormatArg::Kind::Int) FormatError(Fmt);
+    Value = static_cast<int>(A.I);
+    ++I;
+    return;
+  }
+  while (I < Fmt.size() && Fmt[I] >= '0' && Fmt[I] <= '9') {
+    Value = Value * 10 + (Fmt[I] - '0');
+    if (Value > 100000) FormatError(Fmt);
+    ++I;
+  }
+}
+
+/// Reads a conversion from `I` (just after the `%`) to its letter, where `I` stops.
+TConversion ReadConversion(std::string_view Fmt, size_t& I, TArgCursor& Args) {
+  TConversion C;
+  if (Fmt[I] == '-') {
+    C.Left = true;
+    ++I;
+  }
+  ReadNumber(Fmt, I, Args, C.Width);
+  if (I < Fmt.size() && Fmt[I] == '.') {
+    ++I;
+    C.Prec = 0;
+    ReadNumber(Fmt, I, Args, C.Prec);
+  }
+  if (I >= Fmt.size()) FormatError(Fmt);
+  C.Letter = static_cast<char>(Fmt[I] | 0x20);
+  return C;
+}
+
+/// `%d` and `%u`: a precision is a minimum of digits, zero padded after the sign.
+String FormatDecimal(std::string_view Fmt, const TFormatArg& A, int Prec) {
+  String Body;
+  if (A.K == TFormatArg::Kind::Int) Body = std::to_string(A.I);
+  else if (A.K == TFormatArg::Kind::UInt) Body = std::to_string(A.U);
+  else FormatError(Fmt);
+  if (Prec > 0) {
+    bool Neg = Body[0] == '-';
+    String Digits = Neg ? Body.substr(1) : Body;
+    if (static_cast<int>(Digits.size()) < Prec) Digits.insert(0, Prec - Digits.size(), '0');
+    Body = (Neg ? "-" : "") + Digits;
+  }
+  return Body;
+}
+
+/// `%x`: upper-case hexadecimal, a precision is a minimum of digits.
+String FormatHex(std::string_view Fmt, const TFormatArg& A, int Prec) {
+  unsigned long long V;
+  if (A.K == TFormatArg::Kind::Int) V = static_cast<unsigned long long>(A.I);
+  else if (A.K == TFormatArg::Kind::UInt) V = A.U;
+  else FormatError(Fmt);
+  char Buf[32];
+  std::snprintf(Buf, sizeof Buf, "%llX", V);
+  String Body = Buf;
+  if (Prec > static_cast<int>(Body.size())) Body.insert(0, Prec - Body.size(), '0');
+  return Body;
+}
+
+/// `%p`: sixteen hexadecimal digits.
+String FormatPointer(std::string_view Fmt, const TFormatArg& A) {
+  if (A.K != TFormatArg::Kind::Pointer) FormatError(Fmt);
+  char Buf[32];
+  std::snprintf(Buf, sizeof Buf, "%016llX", static_cast<unsigned long long>(A.U));
+  return Buf;
+}
+
+/// `%s`: a precision cuts the string.
+String FormatString(std::string_view Fmt, const TFormatArg& A, int Prec) {
+  if (A.K != TFormatArg::Kind::Str) FormatError(Fmt);
+  return (Prec >= 0 && Prec < static_cast<int>(A.S.size())) ? A.S.substr(0, Prec) : A.S;
+}
+
+/// `%f %e %g %n %m`: fixed, exponent (at least three digits: 1.50E+003), general, and
+/// fixed with thousands separators; two decimals unless a precision says otherwise.
+String FormatFloat(std::string_view Fmt, const TFormatArg& A, char Letter, int Prec) {
+  if (A.K != TFormatArg::Kind::Float) FormatError(Fmt);
+  double V = A.F;
+  int P = Prec < 0 ? (Letter == 'g' ? 15 : 2) : Prec;
+  char Buf[512];
+  if (Letter == 'e') std::snprintf(Buf, sizeof Buf, "%.*E", P, V);
+  else if (Letter == 'g') std::snprintf(Buf, sizeof Buf, "%.*G", P, V);
+  else std::snprintf(Buf, sizeof Buf, "%.*f", P, V);
+  String Body = Buf;
+  if (Letter == 'e') {
+    size_t E = Body.find('E');
+    if (E != String::npos && E + 2 < Body.size())
+      while (Body.size() - (E + 2) < 3) Body.insert(E + 2, "0");
+  }
+  if (Letter == 'n' || Letter == 'm') Body = ThousandsSeparated(Body);
+  return Body;
+}
+
+/// The text of one argument under a conversion, before padding to the width.
+String FormatOne(std::string_view Fmt, const TConversion& C, const TFormatArg& A) {
+  switch (C.Letter) {
+  case 'd':
+  case 'u': return FormatDecimal(Fmt, A, C.Prec);
+  case 'x': return FormatHex(Fmt, A, C.Prec);
+  case 'p': return FormatPointer(Fmt, A);
+  case 's': return FormatString(Fmt, A, C.Prec);
+  case 'f':
+  case 'e':
+  case 'g':
+  case 'n':
+  case 'm': return FormatFloat(Fmt, A, C.Letter, C.Prec);
+  default: FormatError(Fmt);
+  }
+}
+
 } // namespace
 
 String FormatArgs(std::string_view Fmt, std::initializer_list<TFormatArg> Args) {
   String Out;
   Out.reserve(Fmt.size() + 16);
-  const TFormatArg* Arg = Args.begin();
-  const TFormatArg* ArgEnd = Args.end();
-  auto Next = [&]() -> const TFormatArg& {
-    if (Arg == ArgEnd) FormatError(Fmt);
-    return *Arg++;
-  };
+  TArgCursor Cursor(Fmt, Args);
   for (size_t I = 0; I < Fmt.size(); ++I) {
     char C = Fmt[I];
     if (C != '%') {
@@ -186,94 +320,9 @@ String FormatArgs(std::string_view Fmt, std::initializer_list<TFormatArg> Args) 
       Out.push_back('%');
       continue;
     }
-    bool Left = false;
-    if (Fmt[I] == '-') { Left = true; ++I; }
-    auto ReadNumber = [&](int& Value) {
-      if (I < Fmt.size() && Fmt[I] == '*') {
-        const TFormatArg& A = Next();
-        if (A.K != TFormatArg::Kind::Int) FormatError(Fmt);
-        Value = static_cast<int>(A.I);
-        ++I;
-        return;
-      }
-      while (I < Fmt.size() && Fmt[I] >= '0' && Fmt[I] <= '9') {
-        Value = Value * 10 + (Fmt[I] - '0');
-        if (Value > 100000) FormatError(Fmt);
-        ++I;
-      }
-    };
-    int Width = 0, Prec = -1;
-    ReadNumber(Width);
-    if (I < Fmt.size() && Fmt[I] == '.') {
-      ++I;
-      Prec = 0;
-      ReadNumber(Prec);
-    }
-    if (I >= Fmt.size()) FormatError(Fmt);
-    char Conv = static_cast<char>(Fmt[I] | 0x20);
-    const TFormatArg& A = Next();
-    String Body;
-    char Buf[512];
-    switch (Conv) {
-    case 'd':
-    case 'u': {
-      if (A.K == TFormatArg::Kind::Int) Body = std::to_string(A.I);
-      else if (A.K == TFormatArg::Kind::UInt) Body = std::to_string(A.U);
-      else FormatError(Fmt);
-      if (Prec > 0) { // minimum digits, zero padded after the sign
-        bool Neg = Body[0] == '-';
-        String Digits = Neg ? Body.substr(1) : Body;
-        if (static_cast<int>(Digits.size()) < Prec) Digits.insert(0, Prec - Digits.size(), '0');
-        Body = (Neg ? "-" : "") + Digits;
-      }
-      break;
-    }
-    case 'x': {
-      unsigned long long V;
-      if (A.K == TFormatArg::Kind::Int) V = static_cast<unsigned long long>(A.I);
-      else if (A.K == TFormatArg::Kind::UInt) V = A.U;
-      else FormatError(Fmt);
-      std::snprintf(Buf, sizeof Buf, "%llX", V);
-      Body = Buf;
-      if (Prec > static_cast<int>(Body.size())) Body.insert(0, Prec - Body.size(), '0');
-      break;
-    }
-    case 'p': {
-      if (A.K != TFormatArg::Kind::Pointer) FormatError(Fmt);
-      std::snprintf(Buf, sizeof Buf, "%016llX", static_cast<unsigned long long>(A.U));
-      Body = Buf;
-      break;
-    }
-    case 's': {
-      if (A.K != TFormatArg::Kind::Str) FormatError(Fmt);
-      Body = (Prec >= 0 && Prec < static_cast<int>(A.S.size())) ? A.S.substr(0, Prec) : A.S;
-      break;
-    }
-    case 'f':
-    case 'e':
-    case 'g':
-    case 'n':
-    case 'm': {
-      double V;
-      if (A.K == TFormatArg::Kind::Float) V = A.F;
-      else FormatError(Fmt);
-      int P = Prec < 0 ? (Conv == 'g' ? 15 : 2) : Prec;
-      if (Conv == 'e') std::snprintf(Buf, sizeof Buf, "%.*E", P, V);
-      else if (Conv == 'g') std::snprintf(Buf, sizeof Buf, "%.*G", P, V);
-      else std::snprintf(Buf, sizeof Buf, "%.*f", P, V);
-      Body = Buf;
-      if (Conv == 'e') { // exponents have at least three digits: 1.50E+003
-        size_t E = Body.find('E');
-        if (E != String::npos && E + 2 < Body.size())
-          while (Body.size() - (E + 2) < 3) Body.insert(E + 2, "0");
-      }
-      if (Conv == 'n' || Conv == 'm') Body = ThousandsSeparated(Body);
-      break;
-    }
-    default:
-      FormatError(Fmt);
-    }
-    Out += Pad(std::move(Body), Width, Left);
+    TConversion Conv = ReadConversion(Fmt, I, Cursor);
+    const TFormatArg& A = Cursor.Next();
+    Out += Pad(FormatOne(Fmt, Conv, A), Conv.Width, Conv.Left);
   }
   return Out;
 }

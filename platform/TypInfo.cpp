@@ -341,6 +341,18 @@ String GetStrProp(TObject* I, PPropInfo P) { return P->Access->GetStr(I); }
 void SetStrProp(TObject* I, PPropInfo P, const String& V) { P->Access->SetStr(I, V); }
 WideString GetWideStrProp(TObject* I, PPropInfo P) { return P->Access->GetWStr(I); }
 void SetWideStrProp(TObject* I, PPropInfo P, const WideString& V) { P->Access->SetWStr(I, V); }
+
+String GetAnsiStrProp(TObject* I, PPropInfo P) {
+  // The value slot would also serve a text field typed as another kind: the kind decides.
+  if (!tkStrings.Contains(P->Kind())) detail::RaiseWrongKind(P);
+  return P->Access->GetStr(I);
+}
+
+void SetAnsiStrProp(TObject* I, PPropInfo P, const String& V) {
+  if (!tkStrings.Contains(P->Kind())) detail::RaiseWrongKind(P);
+  P->Access->SetStr(I, V);
+}
+
 double GetFloatProp(TObject* I, PPropInfo P) { return P->Access->GetFloat(I); }
 void SetFloatProp(TObject* I, PPropInfo P, double V) { P->Access->SetFloat(I, V); }
 std::int64_t GetInt64Prop(TObject* I, PPropInfo P) { return P->Access->GetOrd(I); }

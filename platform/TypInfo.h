@@ -183,6 +183,14 @@ FK_API String GetStrProp(TObject* Instance, PPropInfo Prop);
 FK_API void SetStrProp(TObject* Instance, PPropInfo Prop, const String& Value);
 FK_API WideString GetWideStrProp(TObject* Instance, PPropInfo Prop);
 FK_API void SetWideStrProp(TObject* Instance, PPropInfo Prop, const WideString& Value);
+/// The 8-bit form of a text property: short, long, wide and Unicode string kinds alike.
+/// Every 8-bit string of this library is UTF-8, so "ansi" means UTF-8 bytes here, never a
+/// code page: the value reads and writes exactly as through `GetStrProp`/`SetStrProp`, a
+/// wide property converting from and to UTF-16, so that valid text of any script comes
+/// back byte for byte. Any other kind raises `EPropertyConvertError`
+/// "Invalid property type: %s" with the property's type name; the instance keeps its value.
+FK_API String GetAnsiStrProp(TObject* Instance, PPropInfo Prop);
+FK_API void SetAnsiStrProp(TObject* Instance, PPropInfo Prop, const String& Value);
 FK_API double GetFloatProp(TObject* Instance, PPropInfo Prop);
 FK_API void SetFloatProp(TObject* Instance, PPropInfo Prop, double Value);
 FK_API std::int64_t GetInt64Prop(TObject* Instance, PPropInfo Prop);

@@ -206,6 +206,7 @@ template <class T> TClass BuildClass(const char* Name, const char* Unit);
 } // namespace detail
 
 /// Refines a property just published: its type record, default and stored specifier.
+/// Does not own the property record, which belongs to its class record.
 class FK_API TPropBuilder {
 public:
   explicit TPropBuilder(TPropInfo* Prop) : FProp(Prop) {}
@@ -252,13 +253,12 @@ public:
   TPropBuilder Property(const char* Name, G Getter, S Setter = nullptr) {
     using V = typename detail::AccessorValue<G>::Value;
     static_assert(detail::SlotOf<V>() != detail::TValueSlot::None, "no property kind for this type");
-    auto* Prop = new TPropInfo;
+    auto Prop = std::make_unique<TPropInfo>();
     Prop->Name = Name;
     Prop->TypeFn = &TypeInfo<V>;
     Prop->Declaring = FRec;
-    Prop->Access = std::make_unique<detail::TPropAccessImpl<T, V, G, S>>(Prop, Getter, Setter);
-    FRec->AddOwnProperty(Prop);
-    return TPropBuilder(Prop);
+    Prop->Access = std::make_unique<detail::TPropAccessImpl<T, V, G, S>>(Prop.get(), Getter, Setter);
+    return TPropBuilder(FRec->AddOwnProperty(std::move(Prop)));
   }
   /// A property read and written through one field.
   template <class V, class C> TPropBuilder Field(const char* Name, V C::*Member) {

@@ -30,6 +30,10 @@ struct TChildList {
   std::vector<const void*> Order;
 };
 
+} // namespace detail
+
+namespace {
+
 /// What a value is compared with.
 struct TCompareContext {
   TPersistent* Ancestor = nullptr;
@@ -37,12 +41,6 @@ struct TCompareContext {
   TComponent* RootAncestor = nullptr;
   const TFindComponentValueEvent* FindComponentValue = nullptr;
 };
-
-} // namespace detail
-
-namespace {
-
-using detail::TCompareContext;
 
 /// A component value is written as a reference unless it is a sub-component of the
 /// object that holds it.
@@ -97,10 +95,6 @@ bool IsBooleanType(PTypeInfo Type) {
 TPersistent* AncestorFor(TPersistent* Ancestor, PPropInfo Prop) {
   return Ancestor && Ancestor->InheritsFrom(Prop->Declaring) ? Ancestor : nullptr;
 }
-
-} // namespace
-
-namespace detail {
 
 /// True when the value of `Prop` would not be written: equal to the ancestor's, or to
 /// the default without an ancestor. Sub-objects are never default here: their own
@@ -170,7 +164,13 @@ bool IsDefaultValue(TObject* Instance, PPropInfo Prop, const TCompareContext& Ct
   }
 }
 
-} // namespace detail
+/// True when the writer leaves the value of `Prop` out: equal to its ancestor's, or to
+/// the default without an ancestor.
+bool IsUnchanged(const TWriter& W, TObject* Instance, PPropInfo Prop) {
+  return IsDefaultValue(Instance, Prop, TCompareContext{W.Ancestor(), W.LookupRoot(), W.RootAncestor(), nullptr});
+}
+
+} // namespace
 
 //===----------------------------------------------------------------------===//
 // TWriter: primitives
@@ -182,10 +182,7 @@ TWriter::TWriter(TStream* Stream, int BufSize) : TFiler(Stream, BufSize) {}
 
 void TWriter::BeforeDestruction() {
   // A failure here cannot be reported; callers that must know call FlushBuffer first.
-  try {
-    FlushBuffer();
-  } catch (...) {
-  }
+  RunIgnoringExceptions([this] { FlushBuffer(); });
   inherited::BeforeDestruction();
 }
 
@@ -335,75 +332,71 @@ void TWriter::WriteProperty(TPersistent* Instance, PPropInfo Prop) {
   TTypeKind Kind = Prop->Kind();
   if (Kind != tkClass && !Prop->IsWritable()) return;
   if (!IsStoredProp(Instance, Prop)) return;
-  TCompareContext Ctx{FAncestor, FLookupRoot, FRootAncestor, nullptr};
-  PTypeInfo Type = Prop->PropType();
+  switch (Kind) {
+  case tkClass: WriteObjectProperty(Instance, Prop); break;
+  case tkInterface: WriteInterfaceProperty(Instance, Prop); break;
+  case tkMethod: WriteMethodProperty(Instance, Prop); break;
+  default: WriteValueProperty(Instance, Prop); break;
+  }
+}
 
-  if (Kind == tkClass) {
-    TObject* V = GetObjectProp(Instance, Prop);
-    TPersistent* Anc = AncestorFor(FAncestor, Prop);
-    if (V && !IsReference(Instance, V)) {
-      if (auto* Coll = dynamic_cast<TCollection*>(V)) {
-        if (detail::IsDefaultValue(Instance, Prop, Ctx)) return;
-        WritePropName(Prop->Name);
-        WriteCollection(Coll);
-        return;
-      }
-      auto* Sub = dynamic_cast<TPersistent*>(V);
-      if (!Sub) return;
-      // A sub-object's properties are written with its path, against the ancestor's
-      // sub-object.
-      String OldPath = FPropPath;
-      TPersistent* OldAncestor = FAncestor;
-      FPropPath += Prop->Name;
-      FPropPath += '.';
-      FAncestor = Anc ? dynamic_cast<TPersistent*>(GetObjectProp(Anc, Prop)) : nullptr;
-      try {
-        WriteProperties(Sub);
-      } catch (...) {
-        FPropPath = OldPath;
-        FAncestor = OldAncestor;
-        throw;
-      }
-      FPropPath = OldPath;
-      FAncestor = OldAncestor;
-      return;
+void TWriter::WriteObjectProperty(TPersistent* Instance, PPropInfo Prop) {
+  TObject* V = GetObjectProp(Instance, Prop);
+  if (V && !IsReference(Instance, V)) {
+    if (auto* Coll = dynamic_cast<TCollection*>(V)) {
+      if (IsUnchanged(*this, Instance, Prop)) return;
+      WritePropName(Prop->Name);
+      WriteCollection(Coll);
+    } else if (auto* Sub = dynamic_cast<TPersistent*>(V)) {
+      WriteSubProperties(Sub, Prop);
     }
-    if (!Prop->IsWritable() || detail::IsDefaultValue(Instance, Prop, Ctx)) return;
-    WritePropName(Prop->Name);
-    if (V) WriteIdent(ReferencePath(static_cast<TComponent*>(V), FLookupRoot));
-    else WriteValue(vaNil);
     return;
   }
+  if (!Prop->IsWritable() || IsUnchanged(*this, Instance, Prop)) return;
+  WritePropName(Prop->Name);
+  if (V) WriteIdent(ReferencePath(static_cast<TComponent*>(V), FLookupRoot));
+  else WriteValue(vaNil);
+}
 
-  if (Kind == tkInterface) {
-    IPtr<IInterface> I = GetInterfaceProp(Instance, Prop);
-    TComponent* C = ComponentOfInterface(I);
-    if (I && !C) return; // only components can be named in a stream
-    if (detail::IsDefaultValue(Instance, Prop, Ctx)) return;
-    WritePropName(Prop->Name);
-    if (C) WriteIdent(ReferencePath(C, FLookupRoot));
-    else WriteValue(vaNil);
-    return;
-  }
+void TWriter::WriteSubProperties(TPersistent* Sub, PPropInfo Prop) {
+  // A sub-object's properties are written with its path, against the ancestor's
+  // sub-object.
+  TPersistent* Anc = AncestorFor(FAncestor, Prop);
+  auto Restore = Finally([this, OldPath = FPropPath, OldAncestor = FAncestor]() mutable noexcept {
+    FPropPath = std::move(OldPath);
+    FAncestor = OldAncestor;
+  });
+  FPropPath += Prop->Name;
+  FPropPath += '.';
+  FAncestor = Anc ? dynamic_cast<TPersistent*>(GetObjectProp(Anc, Prop)) : nullptr;
+  WriteProperties(Sub);
+}
 
-  if (Kind == tkMethod) {
-    TMethod M = GetMethodProp(Instance, Prop);
-    String Name = MethodNameOf(M);
-    if (M.IsAssigned() && Name.empty()) return; // a method without a published name
-    if (detail::IsDefaultValue(Instance, Prop, Ctx)) return;
-    WritePropName(Prop->Name);
-    if (Name.empty()) WriteValue(vaNil);
-    else WriteIdent(Name);
-    return;
-  }
+void TWriter::WriteInterfaceProperty(TPersistent* Instance, PPropInfo Prop) {
+  IPtr<IInterface> I = GetInterfaceProp(Instance, Prop);
+  TComponent* C = ComponentOfInterface(I);
+  if (I && !C) return; // only components can be named in a stream
+  if (IsUnchanged(*this, Instance, Prop)) return;
+  WritePropName(Prop->Name);
+  if (C) WriteIdent(ReferencePath(C, FLookupRoot));
+  else WriteValue(vaNil);
+}
 
-  if (Kind == tkVariant) {
-    TVarType VT = GetVariantProp(Instance, Prop).VarType();
-    if (VT == varUnknown) return;
-  }
+void TWriter::WriteMethodProperty(TPersistent* Instance, PPropInfo Prop) {
+  TMethod M = GetMethodProp(Instance, Prop);
+  String Name = MethodNameOf(M);
+  if (M.IsAssigned() && Name.empty()) return; // a method without a published name
+  if (IsUnchanged(*this, Instance, Prop)) return;
+  WritePropName(Prop->Name);
+  if (Name.empty()) WriteValue(vaNil);
+  else WriteIdent(Name);
+}
 
-  if (detail::IsDefaultValue(Instance, Prop, Ctx)) return;
-
+void TWriter::WriteValueProperty(TPersistent* Instance, PPropInfo Prop) {
+  TTypeKind Kind = Prop->Kind();
+  if (Kind == tkVariant && GetVariantProp(Instance, Prop).VarType() == varUnknown) return;
+  if (IsUnchanged(*this, Instance, Prop)) return;
+  PTypeInfo Type = Prop->PropType();
   switch (Kind) {
   case tkInteger:
   case tkChar:
@@ -461,23 +454,19 @@ void TWriter::WriteProperty(TPersistent* Instance, PPropInfo Prop) {
 
 void TWriter::WriteCollection(TCollection* Value) {
   WriteValue(vaCollection);
-  String OldPath = std::exchange(FPropPath, String());
-  TPersistent* OldAncestor = std::exchange(FAncestor, nullptr);
-  try {
-    if (Value)
-      for (int I = 0; I < Value->Count(); ++I) {
-        WriteListBegin();
-        WriteProperties(Value->Items(I));
-        WriteListEnd();
-      }
-    WriteListEnd();
-  } catch (...) {
-    FPropPath = OldPath;
+  // Items are written in full, with names of their own.
+  auto Restore = Finally([this, OldPath = std::exchange(FPropPath, String()),
+                          OldAncestor = std::exchange(FAncestor, nullptr)]() mutable noexcept {
+    FPropPath = std::move(OldPath);
     FAncestor = OldAncestor;
-    throw;
-  }
-  FPropPath = OldPath;
-  FAncestor = OldAncestor;
+  });
+  if (Value)
+    for (int I = 0; I < Value->Count(); ++I) {
+      WriteListBegin();
+      WriteProperties(Value->Items(I));
+      WriteListEnd();
+    }
+  WriteListEnd();
 }
 
 void TWriter::DefineProperty(const String& Name, const TReaderProc&, const TWriterProc& WriteData, bool HasData) {
@@ -513,34 +502,26 @@ void TWriter::WriteDescendent(TComponent* ARoot, TComponent* AAncestor) {
 }
 
 void TWriter::WriteComponent(TComponent* Component) {
-  TPersistent* OldAncestor = FAncestor;
-  TComponent* OldRootAncestor = FRootAncestor;
-  auto Restore = [&] {
+  auto Restore = Finally([this, Component, OldAncestor = FAncestor, OldRootAncestor = FRootAncestor]() noexcept {
     FAncestor = OldAncestor;
     FRootAncestor = OldRootAncestor;
     Component->SetWriting(false);
-  };
-  try {
-    Component->SetWriting(true);
-    if (FChildren) {
-      auto It = FChildren->ByName.find(UpperCase(Component->Name()));
-      FAncestor = It != FChildren->ByName.end() && !Component->Name().empty() ? It->second : nullptr;
-    } else if (Component != FRoot) {
-      FAncestor = nullptr;
-    }
-    if (OnFindAncestor) {
-      auto* A = dynamic_cast<TComponent*>(FAncestor);
-      if (!FAncestor || A) {
-        OnFindAncestor(this, Component, Component->Name(), A, FRootAncestor);
-        FAncestor = A;
-      }
-    }
-    Component->WriteState(this);
-  } catch (...) {
-    Restore();
-    throw;
+  });
+  Component->SetWriting(true);
+  if (FChildren) {
+    auto It = FChildren->ByName.find(UpperCase(Component->Name()));
+    FAncestor = It != FChildren->ByName.end() && !Component->Name().empty() ? It->second : nullptr;
+  } else if (Component != FRoot) {
+    FAncestor = nullptr;
   }
-  Restore();
+  if (OnFindAncestor) {
+    auto* A = dynamic_cast<TComponent*>(FAncestor);
+    if (!FAncestor || A) {
+      OnFindAncestor(this, Component, Component->Name(), A, FRootAncestor);
+      FAncestor = A;
+    }
+  }
+  Component->WriteState(this);
 }
 
 void TWriter::WriteChild(TComponent* Child) {
@@ -553,66 +534,60 @@ void TWriter::WriteData(TComponent* Instance) {
   int Pos = -1;
   if (FAncestor) Flags.Include(ffInherited);
   if (Instance->ComponentState().Contains(csInline)) Flags.Include(ffInline);
-  if (FChildren) {
-    // Mirror what the reader will do: a new child lands at the end, and a child that
-    // does not stand where the reader will have it is moved there.
-    auto& Order = FChildren->Order;
-    const void* Key = FAncestor ? static_cast<const void*>(FAncestor) : static_cast<const void*>(Instance);
-    if (!FAncestor) Order.push_back(Key);
-    if (FChildPos >= Order.size() || Order[FChildPos] != Key) {
-      auto It = std::find(Order.begin(), Order.end(), Key);
-      if (It != Order.end()) {
-        Order.erase(It);
-        Order.insert(Order.begin() + static_cast<std::ptrdiff_t>(std::min(FChildPos, Order.size())), Key);
-        Flags.Include(ffChildPos);
-        Pos = static_cast<int>(FChildPos);
-      }
-    }
+  if (FChildren && TakesChildPosition(Instance)) {
+    Flags.Include(ffChildPos);
+    Pos = static_cast<int>(FChildPos);
   }
   WriteFilerFlags(Flags, Pos);
   WriteStr(Instance->ClassName());
   WriteStr(Instance->Name());
   WriteProperties(Instance);
   WriteListEnd();
+  if (!FIgnoreChildren) WriteChildren(Instance);
+  WriteListEnd();
+}
 
-  detail::TChildList* OldChildren = FChildren;
-  std::size_t OldChildPos = FChildPos;
-  TComponent* OldRoot = FRoot;
-  TComponent* OldLookupRoot = FLookupRoot;
-  TComponent* OldRootAncestor = FRootAncestor;
-  auto Restore = [&] {
+bool TWriter::TakesChildPosition(TComponent* Instance) {
+  // Mirror what the reader will do: a new child lands at the end, and a child that
+  // does not stand where the reader will have it is moved there.
+  auto& Order = FChildren->Order;
+  const void* Key = FAncestor ? static_cast<const void*>(FAncestor) : static_cast<const void*>(Instance);
+  if (!FAncestor) Order.push_back(Key);
+  if (FChildPos < Order.size() && Order[FChildPos] == Key) return false;
+  auto It = std::find(Order.begin(), Order.end(), Key);
+  if (It == Order.end()) return false;
+  Order.erase(It);
+  Order.insert(Order.begin() + static_cast<std::ptrdiff_t>(std::min(FChildPos, Order.size())), Key);
+  return true;
+}
+
+void TWriter::WriteChildren(TComponent* Instance) {
+  detail::TChildList Children;
+  auto Restore = Finally([this, OldChildren = FChildren, OldChildPos = FChildPos, OldRoot = FRoot,
+                          OldLookupRoot = FLookupRoot, OldRootAncestor = FRootAncestor]() noexcept {
     FChildren = OldChildren;
     FChildPos = OldChildPos;
     FRoot = OldRoot;
     FLookupRoot = OldLookupRoot;
     FRootAncestor = OldRootAncestor;
-  };
-  try {
-    if (!FIgnoreChildren) {
-      detail::TChildList Children;
-      if (auto* AncComp = dynamic_cast<TComponent*>(FAncestor)) {
-        if (AncComp->ComponentState().Contains(csInline)) FRootAncestor = AncComp;
-        AncComp->GetChildren(
-            [&](TComponent* C) {
-              Children.Order.push_back(C);
-              if (!C->Name().empty()) Children.ByName.emplace(UpperCase(C->Name()), C);
-            },
-            FRootAncestor);
-      }
-      FChildren = &Children;
-      FChildPos = 0;
-      if (Instance != OldRoot && Instance->ComponentState().Contains(csInline)) {
-        FRoot = Instance;
-        FLookupRoot = Instance;
-      }
-      Instance->GetChildren([this](TComponent* C) { WriteChild(C); }, FRoot);
-    }
-  } catch (...) {
-    Restore();
-    throw;
+  });
+  if (auto* AncComp = dynamic_cast<TComponent*>(FAncestor)) {
+    if (AncComp->ComponentState().Contains(csInline)) FRootAncestor = AncComp;
+    AncComp->GetChildren(
+        [&](TComponent* C) {
+          Children.Order.push_back(C);
+          if (!C->Name().empty()) Children.ByName.emplace(UpperCase(C->Name()), C);
+        },
+        FRootAncestor);
   }
-  Restore();
-  WriteListEnd();
+  FChildren = &Children;
+  FChildPos = 0;
+  // The components of a nested root are written under it and named from it.
+  if (Instance != FRoot && Instance->ComponentState().Contains(csInline)) {
+    FRoot = Instance;
+    FLookupRoot = Instance;
+  }
+  Instance->GetChildren([this](TComponent* C) { WriteChild(C); }, FRoot);
 }
 
 //===----------------------------------------------------------------------===//
@@ -653,7 +628,7 @@ bool IsDefaultPropertyValue(TObject* Instance, PPropInfo Prop, const TGetLookupI
   }
   if (!LookupRoot) LookupRoot = Root;
   TCompareContext Ctx{Ancestor, LookupRoot, RootAncestor, &OnFindComponentValue};
-  return detail::IsDefaultValue(Instance, Prop, Ctx);
+  return IsDefaultValue(Instance, Prop, Ctx);
 }
 
 } // namespace formkit

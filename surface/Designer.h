@@ -478,7 +478,7 @@ private:
   void Modified();
 
   std::vector<IPtr<IItem>> FList;
-  TSelectionListenerHelper* FListeners = nullptr; // owned
+  TObjectGuard<TSelectionListenerHelper> FListeners;
   int FBeginCount = 0;
   bool FDirty = false;
 };

@@ -151,6 +151,8 @@ private:
   friend class TItemWrapper;
   void BringToFront(const IPtr<IItem>& Item);
   void ResetDrag() noexcept;
+  /// Drops the guide lists and the dragged item's guides once they were shown.
+  void ForgetGuides() noexcept;
   bool GuideStepsEnabled();
   TRect GetSizeRect(const TPoint& Point, bool AtAnchor);
   void ArrowStep(TDesignKeyCode Key, TShiftState Shift);

@@ -18,14 +18,25 @@ namespace formkit {
 
 FK_IMPLEMENT(TDesigner, "Designer") {}
 
-namespace detail {
+namespace {
 /// Left not beyond right, top not beyond bottom.
-inline TRect Normalised(TRect R) noexcept {
+TRect Normalised(TRect R) noexcept {
   if (R.Left > R.Right) std::swap(R.Left, R.Right);
   if (R.Top > R.Bottom) std::swap(R.Top, R.Bottom);
   return R;
 }
-} // namespace detail
+
+/// Runs `Step` inside one selection batch of `Designer`, so that listeners hear of it
+/// once. The batch closes however `Step` ends; a listener that fails at the close of a
+/// failed step cannot hide that failure, while after success its failure passes on.
+template <class F> void InSelectionBatch(TDesigner& Designer, F&& Step) {
+  Designer.BeginSelect();
+  auto End = OnFailure([&Designer]() noexcept { RunIgnoringExceptions([&Designer] { Designer.EndSelect(); }); });
+  Step();
+  End.Dismiss();
+  Designer.EndSelect();
+}
+} // namespace
 
 TDesigner::TDesigner(const IPtr<IDesignSurface>& Surface, const IPtr<ISelections>& Selections,
                      const IPtr<ITools>& Tools)
@@ -84,8 +95,7 @@ IPtr<IItem> TDesigner::SelectedItem() {
 
 void TDesigner::Select(const IPtr<IItem>& Item, bool Add) {
   if (!Item) return;
-  BeginSelect();
-  try {
+  InSelectionBatch(*this, [&] {
     if (Add) {
       if (FSelections->Selected(Item)) FSelections->Remove(Item);
       else FSelections->Add(Item);
@@ -96,11 +106,7 @@ void TDesigner::Select(const IPtr<IItem>& Item, bool Add) {
     // The handles go on the item that was passed, even where a toggle took it out
     // and another one is left: the surface repaints them on the next selection.
     if (FDragAction == daNone) AttachHandles(FSelections->GetCount() == 1 ? Item : nullptr);
-  } catch (...) {
-    EndSelect();
-    throw;
-  }
-  EndSelect();
+  });
 }
 
 void TDesigner::Edit(const IPtr<IItem>& Item) {
@@ -117,20 +123,14 @@ bool TDesigner::IsDesignerSelected() {
 }
 
 void TDesigner::ForceCommonSelectParent(const IPtr<IItem>& Parent) {
-  BeginSelect();
-  try {
+  InSelectionBatch(*this, [&] {
     for (int I = FSelections->GetCount() - 1; I >= 0; --I)
       if (!SameItem(FSelections->GetItems(I)->GetParent(), Parent)) FSelections->Remove(I);
-  } catch (...) {
-    EndSelect();
-    throw;
-  }
-  EndSelect();
+  });
 }
 
 void TDesigner::BringToFront(const IPtr<IItem>& Item) {
-  BeginSelect();
-  try {
+  InSelectionBatch(*this, [&] {
     std::vector<IPtr<IItem>> Others;
     for (int I = FSelections->GetCount() - 1; I >= 0; --I) {
       IPtr<IItem> Entry = FSelections->GetItems(I);
@@ -140,11 +140,7 @@ void TDesigner::BringToFront(const IPtr<IItem>& Item) {
       }
     }
     for (const IPtr<IItem>& Entry : Others) FSelections->Add(Entry);
-  } catch (...) {
-    EndSelect();
-    throw;
-  }
-  EndSelect();
+  });
 }
 
 //===----------------------------------------------------------------------===//
@@ -157,71 +153,68 @@ void TDesigner::MouseDown(const IPtr<IItem>& AItem, TShiftState Shift, int X, in
   DragCancel();
   FDragParent = nullptr;
   FDesignSurface->FocusSurface();
-  try {
-    IPtr<IItem> Item = AItem;
-    const IPtr<IItem> Root = FDesignSurface->GetRoot();
-    const bool ShiftDown = Shift.Contains(ssShift);
-    const bool CtrlDown = Shift.Contains(ssCtrl);
+  // An exception leaves the engine idle.
+  auto Idle = OnFailure([this]() noexcept { ResetDrag(); });
+  IPtr<IItem> Item = AItem;
+  const IPtr<IItem> Root = FDesignSurface->GetRoot();
+  const bool ShiftDown = Shift.Contains(ssShift);
+  const bool CtrlDown = Shift.Contains(ssCtrl);
 
-    if (Item) {
-      FDragParent = Item;
-      if (ShiftDown && FSelections->GetCount() == 1 && !SameItem(Item, Root)) {
-        IPtr<IItem> Parent = FSelections->GetItems(0)->GetParent();
-        if (Parent && Parent->Contains(Item)) FDragParent = Parent;
-      }
-      while (FDragParent && FDragParent->GetParent() && !FDragParent->IsContainer())
-        FDragParent = FDragParent->GetParent();
-      while (Item && !Item->Selectable()) Item = Item->GetParent();
+  if (Item) {
+    FDragParent = Item;
+    if (ShiftDown && FSelections->GetCount() == 1 && !SameItem(Item, Root)) {
+      IPtr<IItem> Parent = FSelections->GetItems(0)->GetParent();
+      if (Parent && Parent->Contains(Item)) FDragParent = Parent;
     }
-
-    FDragAffects = AllMoveAffects;
-    if (!Affects.Empty()) {
-      if (FLocked) return; // a handle of a locked surface: no drag, no selection change
-      FDragAffects = Affects;
-      FDragAction = Affects == AllMoveAffects ? daMove : daSize;
-    } else if (!FLocked) {
-      FDragAction = daMove;
-    }
-
-    if (FTools->ToolSelected() && !NoDrag) {
-      FDragAction = daCreate;
-      ClearSelection();
-    } else if (DoubleClick && !ShiftDown && !CtrlDown) {
-      FDragAction = daNone;
-      if (!SameItem(Item, Root) && (FSelections->GetCount() == 1 || FSelections->Selected(Item))) {
-        Edit(Item);
-      } else {
-        Select(Item, false);
-        Edit(Item);
-      }
-    } else if (SameItem(Item, Root) || CtrlDown) {
-      FDragAction = daSelect;
-      if (Item && !SameItem(Item, FDragParent) && Item->HasSelectableChildren()) FDragParent = Item;
-      if (!ShiftDown) Select(Root, false);
-    } else if (!ShiftDown) {
-      FDragParent = Item ? Item->GetParent() : nullptr;
-      if (!FSelections->Selected(Item)) {
-        Select(Item, false);
-      } else if (FSelections->GetCount() > 1 && !FSelections->GetItems(0)->Equals(Item)) {
-        BringToFront(Item);
-      }
-      if (!FLocked) ForceCommonSelectParent(FDragParent);
-    } else {
-      FDragAction = daNone;
-      Select(Item, true);
-    }
-
-    if (Shift.Contains(ssRight)) {
-      FDragAction = daNone;
-      if (FSelections->GetCount() == 1) AttachHandles(FSelections->GetItems(0));
-      FDesignSurface->ShowContextMenu();
-    }
-    if (NoDrag) FDragAction = daNone;
-    if (FDragAction != daNone) DragBegin(X, Y);
-  } catch (...) {
-    ResetDrag();
-    throw;
+    while (FDragParent && FDragParent->GetParent() && !FDragParent->IsContainer())
+      FDragParent = FDragParent->GetParent();
+    while (Item && !Item->Selectable()) Item = Item->GetParent();
   }
+
+  FDragAffects = AllMoveAffects;
+  if (!Affects.Empty()) {
+    if (FLocked) return; // a handle of a locked surface: no drag, no selection change
+    FDragAffects = Affects;
+    FDragAction = Affects == AllMoveAffects ? daMove : daSize;
+  } else if (!FLocked) {
+    FDragAction = daMove;
+  }
+
+  if (FTools->ToolSelected() && !NoDrag) {
+    FDragAction = daCreate;
+    ClearSelection();
+  } else if (DoubleClick && !ShiftDown && !CtrlDown) {
+    FDragAction = daNone;
+    if (!SameItem(Item, Root) && (FSelections->GetCount() == 1 || FSelections->Selected(Item))) {
+      Edit(Item);
+    } else {
+      Select(Item, false);
+      Edit(Item);
+    }
+  } else if (SameItem(Item, Root) || CtrlDown) {
+    FDragAction = daSelect;
+    if (Item && !SameItem(Item, FDragParent) && Item->HasSelectableChildren()) FDragParent = Item;
+    if (!ShiftDown) Select(Root, false);
+  } else if (!ShiftDown) {
+    FDragParent = Item ? Item->GetParent() : nullptr;
+    if (!FSelections->Selected(Item)) {
+      Select(Item, false);
+    } else if (FSelections->GetCount() > 1 && !FSelections->GetItems(0)->Equals(Item)) {
+      BringToFront(Item);
+    }
+    if (!FLocked) ForceCommonSelectParent(FDragParent);
+  } else {
+    FDragAction = daNone;
+    Select(Item, true);
+  }
+
+  if (Shift.Contains(ssRight)) {
+    FDragAction = daNone;
+    if (FSelections->GetCount() == 1) AttachHandles(FSelections->GetItems(0));
+    FDesignSurface->ShowContextMenu();
+  }
+  if (NoDrag) FDragAction = daNone;
+  if (FDragAction != daNone) DragBegin(X, Y);
 }
 
 void TDesigner::MouseMove(int X, int Y) {
@@ -240,12 +233,7 @@ void TDesigner::ResetDrag() noexcept {
   FDragGuide = nullptr;
   FDragItem = nullptr;
   FGuidelinePainter = nullptr;
-  if (IPtr<IDragBoxes> Boxes = std::move(FBoxes)) {
-    try {
-      Boxes->Done();
-    } catch (...) {
-    }
-  }
+  if (IPtr<IDragBoxes> Boxes = std::move(FBoxes)) RunIgnoringExceptions([&Boxes] { Boxes->Done(); });
   FBoxesEx = nullptr;
 }
 
@@ -312,8 +300,12 @@ void TDesigner::DragEnd(int, int, bool Accept) {
 
   const TDragAction Action = FDragAction;
   FDragAction = daNone;
-  BeginSelect();
-  try {
+  InSelectionBatch(*this, [&] {
+    // The handles go on a single selected item however the outcome ends.
+    auto AttachToSingle = [this] {
+      if (FSelections->GetCount() == 1) AttachHandles(FSelections->GetItems(0));
+    };
+    auto Handles = OnFailure([&]() noexcept { RunIgnoringExceptions(AttachToSingle); });
     if (Accept) {
       switch (Action) {
       case daCreate: DoDragCreate(); break;
@@ -323,13 +315,9 @@ void TDesigner::DragEnd(int, int, bool Accept) {
       case daNone: break;
       }
     }
-  } catch (...) {
-    if (FSelections->GetCount() == 1) AttachHandles(FSelections->GetItems(0));
-    EndSelect();
-    throw;
-  }
-  if (FSelections->GetCount() == 1) AttachHandles(FSelections->GetItems(0));
-  EndSelect();
+    Handles.Dismiss();
+    AttachToSingle();
+  });
 }
 
 TRect TDesigner::GetDragRect(const TPoint& Point, bool AtAnchor) {
@@ -343,7 +331,7 @@ TRect TDesigner::GetDragRect(const TPoint& Point, bool AtAnchor) {
       return P;
     };
     const TPoint A = ToParent(FAnchor), B = ToParent(Point);
-    TRect R = detail::Normalised(TRect{A.X, A.Y, B.X, B.Y});
+    TRect R = Normalised(TRect{A.X, A.Y, B.X, B.Y});
     if (FDragAction == daCreate) {
       ++R.Right; // a create box is never empty
       ++R.Bottom;
@@ -384,7 +372,7 @@ TRect TDesigner::GetSizeRect(const TPoint& Point, bool AtAnchor) {
     if (FDragAffects.Contains(gaTop)) Tentative.Top += D.Y;
     if (FDragAffects.Contains(gaRight)) Tentative.Right += D.X;
     if (FDragAffects.Contains(gaBottom)) Tentative.Bottom += D.Y;
-    Tentative = detail::Normalised(Tentative);
+    Tentative = Normalised(Tentative);
     FDragItem->SetOffset(D);
     FDragItem->SetBoundsRect(Tentative);
   }
@@ -431,7 +419,7 @@ TRect TDesigner::GetSizeRect(const TPoint& Point, bool AtAnchor) {
     }
     Delta = R.*E.Field - V;
   }
-  R = detail::Normalised(R);
+  R = Normalised(R);
   if (UseGuides) {
     FDragItem->SetOffset(D);
     FDragItem->SetBoundsRect(R);

@@ -170,22 +170,24 @@ void TDesigner::ShowGuides() {
   FAllowedVertGuides = VertGuideTypes;
   FDragGuide = NewAs<IItemGuidelines, TItemGuidelinesSorter>(First->GetItemGuidelines());
   FDragItem = NewAs<IItemWrapper, TItemWrapper>(First, this);
-  try {
-    GetGuides();
-    GenerateGuidelines();
-  } catch (...) {
-    FHorzGuides.clear();
-    FVertGuides.clear();
-    FDragItem = nullptr;
-    FDragGuide = nullptr;
-    FGuidelinePainter->EndPaint();
-    throw;
-  }
+  // The guides are shown, not kept for a drag: they go however the painting ends. Ending
+  // the painting may fail; after a failure here that one passes on.
+  auto End = OnFailure([this]() noexcept {
+    ForgetGuides();
+    RunIgnoringExceptions([this] { FGuidelinePainter->EndPaint(); });
+  });
+  GetGuides();
+  GenerateGuidelines();
+  End.Dismiss();
+  ForgetGuides();
+  FGuidelinePainter->EndPaint();
+}
+
+void TDesigner::ForgetGuides() noexcept {
   FHorzGuides.clear();
   FVertGuides.clear();
   FDragItem = nullptr;
   FDragGuide = nullptr;
-  FGuidelinePainter->EndPaint();
 }
 
 } // namespace formkit

@@ -39,7 +39,7 @@ FK_IMPLEMENT(TSimpleSelections, "Designer") {}
 TSimpleSelections::TSimpleSelections() : FListeners(new TSelectionListenerHelper) {}
 
 void TSimpleSelections::BeforeDestruction() {
-  FreeAndNil(FListeners);
+  FListeners.Reset();
   inherited::BeforeDestruction();
 }
 

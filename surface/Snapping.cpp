@@ -25,7 +25,7 @@ namespace formkit {
 FK_IMPLEMENT(TItemWrapper, "Designer") {}
 FK_IMPLEMENT(TItemGuidelinesSorter, "Designer") {}
 
-namespace detail {
+namespace {
 
 /// The first guide at or after `Position`.
 inline TGuideList::const_iterator FirstGuideFrom(const TGuideList& List, long long Position) {
@@ -54,7 +54,7 @@ inline bool IsAlignOrBaseline(TGuideType T) noexcept {
          T == gtBaseline;
 }
 
-} // namespace detail
+} // namespace
 
 //===----------------------------------------------------------------------===//
 // TItemWrapper
@@ -240,7 +240,7 @@ bool TDesigner::SnapToAlignGuide(int& Position, const IPtr<IItemGuidelines>& Gui
     const TGuideType T = Guides->GetDesignerGuideType(I);
     if (!Types.Contains(T)) continue;
     const long long P = static_cast<long long>(Guides->GetDesignerGuideOffset(I)) + Travel;
-    for (auto G = detail::FirstGuideFrom(List, P - Limit); G != List.end() && G->FGuide <= P + Limit; ++G) {
+    for (auto G = FirstGuideFrom(List, P - Limit); G != List.end() && G->FGuide <= P + Limit; ++G) {
       if (G->FGuide < Low || G->FGuide > High || G->FGuideType != T) continue;
       const long long D = G->FGuide - P;
       if (std::llabs(D) > Limit) continue;
@@ -275,16 +275,16 @@ bool TDesigner::SnapToMarginGuide(const IPtr<IItemWrapper>& Item, int& Position,
     const TGuideType T = Guides->GetDesignerGuideType(I);
     if (!Types.Contains(T)) continue;
     const long long P = static_cast<long long>(Guides->GetDesignerGuideOffset(I)) + Travel;
-    for (auto G = detail::FirstGuideFrom(List, P - Limit); G != List.end() && G->FGuide <= P + Limit; ++G) {
+    for (auto G = FirstGuideFrom(List, P - Limit); G != List.end() && G->FGuide <= P + Limit; ++G) {
       // The cheap tests first; all of them are plain filters, so their order is free.
       if (G->FGuideType == T) continue;
       const long long D = G->FGuide - P;
       if (std::llabs(D) > Limit) continue;
       const int GCross1 = AxisY ? G->FGuideRect.Left : G->FGuideRect.Top;
       const int GCross2 = AxisY ? G->FGuideRect.Right : G->FGuideRect.Bottom;
-      if (!detail::SpansMeet(GCross1, GCross2, Cross1, Cross2)) continue;
+      if (!SpansMeet(GCross1, GCross2, Cross1, Cross2)) continue;
       const bool IsParent = SameItem(DraggedParent, IPtr<IItem>(G->FItem->GetItem()));
-      if (!detail::MarginPairs(T, G->FGuideType, IsParent)) continue;
+      if (!MarginPairs(T, G->FGuideType, IsParent)) continue;
       const TRect OwnerBounds = G->FItem->GetBoundsRect();
       TRect Overlap;
       if (!IsParent && IntersectRect(Overlap, Dragged, OwnerBounds)) continue;
@@ -323,11 +323,11 @@ void TDesigner::GenerateGuidelines() {
       if (!Horz && !FAllowedVertGuides.Contains(T)) continue;
       const long long P = static_cast<long long>(FDragGuide->GetDesignerGuideOffset(I)) + (Horz ? WOffset.Y : WOffset.X);
       const TGuideList& List = Horz ? FHorzGuides : FVertGuides;
-      for (auto G = detail::FirstGuideFrom(List, P); G != List.end() && G->FGuide == P; ++G) {
+      for (auto G = FirstGuideFrom(List, P); G != List.end() && G->FGuide == P; ++G) {
         const IPtr<IItemWrapper>& OwnerW = G->FItem;
         const TRect O = OwnerW->GetBoundsRect();
         const int Pos = G->FGuide;
-        if (detail::IsAlignOrBaseline(G->FGuideType)) {
+        if (IsAlignOrBaseline(G->FGuideType)) {
           if (G->FGuideType != T) continue;
           if (Horz) {
             if (Pos < Client.Top || Pos > Client.Bottom) continue;
@@ -343,18 +343,18 @@ void TDesigner::GenerateGuidelines() {
         const bool IsParent = SameItem(DraggedParent, IPtr<IItem>(OwnerW->GetItem()));
         TRect Overlap;
         if (!IsParent && IntersectRect(Overlap, W, O)) continue;
-        if (!detail::MarginPairs(T, G->FGuideType, IsParent)) continue;
+        if (!MarginPairs(T, G->FGuideType, IsParent)) continue;
         const bool FarSide = G->FGuideType == gtMarginTop || G->FGuideType == gtPaddingBottom ||
                              G->FGuideType == gtMarginLeft || G->FGuideType == gtPaddingRight;
         if (Horz) {
-          if (!detail::SpansMeet(WPadded.Left, WPadded.Right, G->FGuideRect.Left, G->FGuideRect.Right)) continue;
+          if (!SpansMeet(WPadded.Left, WPadded.Right, G->FGuideRect.Left, G->FGuideRect.Right)) continue;
           const int X = IsParent ? (W.Right - W.Left) / 2 + W.Left
                                  : (std::min(W.Right, O.Right) - std::max(W.Left, O.Left)) / 2 + std::max(W.Left, O.Left);
           TRect Line = IsParent ? TRect{X, O.Top, X, W.Top} : TRect{X, O.Bottom, X, W.Top};
           if (FarSide) Line = IsParent ? TRect{X, W.Bottom, X, O.Bottom} : TRect{X, W.Bottom, X, O.Top};
           Painter->AddGuide(Line, G->FGuideType);
         } else {
-          if (!detail::SpansMeet(WPadded.Top, WPadded.Bottom, G->FGuideRect.Top, G->FGuideRect.Bottom)) continue;
+          if (!SpansMeet(WPadded.Top, WPadded.Bottom, G->FGuideRect.Top, G->FGuideRect.Bottom)) continue;
           const int Y = IsParent ? (W.Bottom - W.Top) / 2 + W.Top
                                  : (std::min(W.Bottom, O.Bottom) - std::max(W.Top, O.Top)) / 2 + std::max(W.Top, O.Top);
           TRect Line = IsParent ? TRect{O.Left, Y, W.Left, Y} : TRect{O.Right, Y, W.Left, Y};

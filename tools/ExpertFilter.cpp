@@ -116,29 +116,24 @@ String TExpertFilter::Filter(const IPtr<ILineProvider>& AProvider) {
     FFilename.clear();
     return Buffer;
   }
-  try {
-    FBoolStack->SetErrorReporter(IPtr<IErrorReporter>(this));
-    PushProvider(AProvider);
-    String Line;
-    String Expanded;
-    while (FCurLineProviderCount > 0) {
-      ILineProvider* Top = TopProvider();
-      if (!Top->HasMore()) break;
-      Line = Top->NextLine();
-      Expanded.clear();
-      if (!Line.empty()) ExpandLine(Line, Expanded);
-      // Tags of the line may have switched output or changed the provider: decide now.
-      ILineProvider* Now = TopProvider();
-      if (FOutputOn && FBoolStack->GetCurrentValue() && Now && Now->IsOutputOn()) {
-        Buffer += Expanded;
-        if (!Expanded.empty() || Line.empty()) Buffer += LineEnd;
-      }
+  auto Finish = Finally([this]() noexcept { FinishRun(); });
+  FBoolStack->SetErrorReporter(IPtr<IErrorReporter>(this));
+  PushProvider(AProvider);
+  String Line;
+  String Expanded;
+  while (FCurLineProviderCount > 0) {
+    ILineProvider* Top = TopProvider();
+    if (!Top->HasMore()) break;
+    Line = Top->NextLine();
+    Expanded.clear();
+    if (!Line.empty()) ExpandLine(Line, Expanded);
+    // Tags of the line may have switched output or changed the provider: decide now.
+    ILineProvider* Now = TopProvider();
+    if (FOutputOn && FBoolStack->GetCurrentValue() && Now && Now->IsOutputOn()) {
+      Buffer += Expanded;
+      if (!Expanded.empty() || Line.empty()) Buffer += LineEnd;
     }
-  } catch (...) {
-    FinishRun();
-    throw;
   }
-  FinishRun();
   return Buffer;
 }
 
@@ -147,10 +142,7 @@ void TExpertFilter::FinishRun() noexcept {
     IPtr<ILineProvider> Provider = std::move(FLineProviders[--FCurLineProviderCount]);
     // The rest of the stack must be cleaned up and the first error must pass on, so a
     // failing cleanup of one provider is not allowed to stop this.
-    try {
-      Provider->Cleanup();
-    } catch (...) {
-    }
+    RunIgnoringExceptions([&Provider] { Provider->Cleanup(); });
   }
   FBoolStack->Cleanup();
   FFilename.clear();

@@ -117,14 +117,13 @@ void TOTAStringsAdapter::Assign(const IPtr<IOTAStrings>& Source) {
     return;
   }
   FStrings->BeginUpdate();
-  try {
-    FStrings->Clear();
-    int Count = Source ? Source->GetCount() : 0;
-    for (int I = 0; I < Count; ++I) FStrings->AddObject(Source->GetItem(I), Source->GetData(I));
-  } catch (...) {
-    FStrings->EndUpdate();
-    throw;
-  }
+  // Ending the update tells the list's listeners, which may fail: after a failure here
+  // that one passes on, after success theirs does.
+  auto End = OnFailure([this]() noexcept { RunIgnoringExceptions([this] { FStrings->EndUpdate(); }); });
+  FStrings->Clear();
+  int Count = Source ? Source->GetCount() : 0;
+  for (int I = 0; I < Count; ++I) FStrings->AddObject(Source->GetItem(I), Source->GetData(I));
+  End.Dismiss();
   FStrings->EndUpdate();
 }
 

@@ -3,7 +3,7 @@
 
 namespace formkit {
 
-namespace detail {
+namespace {
 int KilnStarts = 0;
 TClass GroupBeforeKiln = nullptr;
 
@@ -14,33 +14,31 @@ std::vector<TClass> KilnClasses() {
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
           TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass()};
 }
-} // namespace detail
+} // namespace
 
 void InitializeKiln() {
-  if (detail::KilnStarts++ > 0) return;
-  try {
-    // The group first: a class joins the group it belongs to when it is registered.
-    StartClassGroup(TControl::StaticClass());
-    GroupDescendentsWith(TDataModule::StaticClass(), TControl::StaticClass());
-    GroupDescendentsWith(TTimer::StaticClass(), TControl::StaticClass());
-    for (TClass C : detail::KilnClasses()) RegisterClass(C);
-    detail::GroupBeforeKiln = ActivateClassGroup(TControl::StaticClass());
-  } catch (...) {
-    for (TClass C : detail::KilnClasses()) UnRegisterClass(C);
-    --detail::KilnStarts;
-    throw;
-  }
+  if (KilnStarts++ > 0) return;
+  auto Undo = OnFailure([]() noexcept {
+    for (TClass C : KilnClasses()) UnRegisterClass(C);
+    --KilnStarts;
+  });
+  // The group first: a class joins the group it belongs to when it is registered.
+  StartClassGroup(TControl::StaticClass());
+  GroupDescendentsWith(TDataModule::StaticClass(), TControl::StaticClass());
+  GroupDescendentsWith(TTimer::StaticClass(), TControl::StaticClass());
+  for (TClass C : KilnClasses()) RegisterClass(C);
+  GroupBeforeKiln = ActivateClassGroup(TControl::StaticClass());
 }
 
 void FinalizeKiln() {
-  if (detail::KilnStarts == 0 || --detail::KilnStarts > 0) return;
-  for (TClass C : detail::KilnClasses()) UnRegisterClass(C);
-  if (detail::GroupBeforeKiln) ActivateClassGroup(detail::GroupBeforeKiln);
-  detail::GroupBeforeKiln = nullptr;
+  if (KilnStarts == 0 || --KilnStarts > 0) return;
+  for (TClass C : KilnClasses()) UnRegisterClass(C);
+  if (GroupBeforeKiln) ActivateClassGroup(GroupBeforeKiln);
+  GroupBeforeKiln = nullptr;
   detail::FreeClipboard();
   if (Screen()->FormCount() == 0) detail::FreeScreen();
 }
 
-bool KilnInitialized() noexcept { return detail::KilnStarts > 0; }
+bool KilnInitialized() noexcept { return KilnStarts > 0; }
 
 } // namespace formkit

@@ -9,7 +9,7 @@ FK_RESOURCESTRING(SEmptyClipFormatName, "A clipboard format needs a name");
 FK_RESOURCESTRING(SUnknownClipFormat, "Clipboard format %d is not registered");
 FK_RESOURCESTRING(SClipFormatIndexError, "Clipboard format index out of bounds (%d)");
 
-namespace detail {
+namespace {
 std::vector<String>& ClipFormatNames() {
   static auto* Names = new std::vector<String>; // immortal: read during teardown
   return *Names;
@@ -19,11 +19,11 @@ bool IsKnownClipFormat(TClipFormat Format) {
   if (Format == CF_TEXT) return true;
   return Format >= FirstRegisteredClipFormat && Format - FirstRegisteredClipFormat < ClipFormatNames().size();
 }
-} // namespace detail
+} // namespace
 
 TClipFormat RegisterClipboardFormat(const String& Name) {
   if (Name.empty()) throw EInvalidOperation(SEmptyClipFormatName);
-  auto& Names = detail::ClipFormatNames();
+  auto& Names = ClipFormatNames();
   for (std::size_t I = 0; I < Names.size(); ++I)
     if (SameText(Names[I], Name)) return FirstRegisteredClipFormat + static_cast<TClipFormat>(I);
   Names.push_back(Name);
@@ -32,8 +32,8 @@ TClipFormat RegisterClipboardFormat(const String& Name) {
 
 String ClipboardFormatName(TClipFormat Format) {
   if (Format == CF_TEXT) return "CF_TEXT";
-  if (!detail::IsKnownClipFormat(Format)) return "";
-  return detail::ClipFormatNames()[Format - FirstRegisteredClipFormat];
+  if (!IsKnownClipFormat(Format)) return "";
+  return ClipFormatNames()[Format - FirstRegisteredClipFormat];
 }
 
 FK_IMPLEMENT(TClipboard, "KilnClipbrd") {}
@@ -60,7 +60,7 @@ void TClipboard::Adding() {
 }
 
 void TClipboard::SetAsHandle(TClipFormat Format, std::vector<std::uint8_t> Data) {
-  if (!detail::IsKnownClipFormat(Format)) throw EInvalidOperation(SUnknownClipFormat, static_cast<unsigned>(Format));
+  if (!IsKnownClipFormat(Format)) throw EInvalidOperation(SUnknownClipFormat, static_cast<unsigned>(Format));
   Open();
   Adding();
   auto It = std::find_if(FData.begin(), FData.end(), [Format](const TEntry& E) { return E.Format == Format; });
@@ -92,19 +92,21 @@ String TClipboard::AsText() const {
 
 void TClipboard::SetAsText(const String& Value) { SetAsHandle(CF_TEXT, std::vector<std::uint8_t>(Value.begin(), Value.end())); }
 
-namespace detail {
+namespace {
 TClipboard*& ClipboardInstance() {
   static TClipboard* C = nullptr;
   return C;
 }
+} // namespace
 
+namespace detail {
 void FreeClipboard() noexcept {
   FreeAndNil(ClipboardInstance());
 }
 } // namespace detail
 
 TClipboard* Clipboard() {
-  TClipboard*& C = detail::ClipboardInstance();
+  TClipboard*& C = ClipboardInstance();
   if (!C) C = new TClipboard;
   return C;
 }

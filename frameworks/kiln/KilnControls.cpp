@@ -17,13 +17,13 @@ FK_RESOURCESTRING(SInvalidPPI, "%d is not a valid number of pixels per inch");
 
 std::function<int(const TControl*)> ControlPPIHook;
 
-namespace detail {
+namespace {
 /// A name for messages: the control's name, or its class name when it has none.
 String DisplayName(const TComponent* C) {
   if (!C) return "(none)";
   return C->Name().empty() ? C->ClassName() : C->Name();
 }
-} // namespace detail
+} // namespace
 
 //===----------------------------------------------------------------------===//
 // TControl
@@ -41,7 +41,7 @@ FK_IMPLEMENT(TControl, "KilnControls") {
 
 void TControl::Create(TComponent* AOwner) {
   inherited::Create(AOwner);
-  FFont = new TFont;
+  FFont.Reset(new TFont);
   FFont->OnChange = TNotifyEvent::Bind<&TControl::FontChangedHandler>(this);
 }
 
@@ -50,7 +50,7 @@ void TControl::BeforeDestruction() {
   // too need not hear of it, nor this control of its new parent: both are going.
   if (FParent && FParent->ComponentState().Contains(csDestroying)) FParent->Detach(this);
   else if (FParent) SetParent(nullptr);
-  FreeAndNil(FFont);
+  FFont.Reset();
   // Last: nothing queued for this control may be delivered once it is gone.
   RemoveMessages(this);
   inherited::BeforeDestruction();
@@ -110,7 +110,7 @@ TPoint TControl::ClientToParent(TPoint P, const TWinControl* AParent) const {
     P.X += C->FLeft + Off.X;
     P.Y += C->FTop + Off.Y;
   }
-  if (!C) throw EInvalidOperation(SControlNotParent, detail::DisplayName(AParent), detail::DisplayName(this));
+  if (!C) throw EInvalidOperation(SControlNotParent, DisplayName(AParent), DisplayName(this));
   return P;
 }
 
@@ -127,17 +127,13 @@ bool TControl::HasAncestor(const TControl* Other) const noexcept {
 
 void TControl::SetParent(TWinControl* Value) {
   if (Value == FParent) return;
-  if (Value == this) throw EInvalidOperation(SControlParentSelf, detail::DisplayName(this));
+  if (Value == this) throw EInvalidOperation(SControlParentSelf, DisplayName(this));
   if (Value && Value->HasAncestor(this))
-    throw EInvalidOperation(SControlParentChild, detail::DisplayName(this), detail::DisplayName(Value));
+    throw EInvalidOperation(SControlParentChild, DisplayName(this), DisplayName(Value));
   TWinControl* Old = FParent;
   if (Old) Old->Detach(this);
   if (Value) Value->Attach(this);
-  if (FParentFont && FParent) {
-    FTakingParentFont = true;
-    FFont->Assign(FParent->Font());
-    FTakingParentFont = false;
-  }
+  if (FParentFont && FParent) TakeParentFont();
   if (Old) Old->Perform(CM_CONTROLCHANGE, reinterpret_cast<std::intptr_t>(this), 0);
   if (Value) Value->Perform(CM_CONTROLCHANGE, reinterpret_cast<std::intptr_t>(this), 1);
   Perform(CM_PARENTCHANGED, reinterpret_cast<std::intptr_t>(Old), reinterpret_cast<std::intptr_t>(Value));
@@ -182,16 +178,15 @@ void TControl::SetColor(TColor Value) {
 
 void TControl::SetParentFont(bool Value) {
   FParentFont = Value;
-  if (Value && FParent) {
-    FTakingParentFont = true;
-    try {
-      FFont->Assign(FParent->Font());
-    } catch (...) {
-      FTakingParentFont = false;
-      throw;
-    }
-    FTakingParentFont = false;
-  }
+  if (Value && FParent) TakeParentFont();
+}
+
+void TControl::TakeParentFont() {
+  // A copy of the parent's font is not the control's own: its change notification must
+  // leave ParentFont on.
+  FTakingParentFont = true;
+  auto Done = Finally([this]() noexcept { FTakingParentFont = false; });
+  FFont->Assign(FParent->Font());
 }
 
 void TControl::FontChangedHandler(TObject*) {
@@ -247,7 +242,7 @@ void TControl::SetParentComponent(TComponent* AParent) {
   // A control read under a non-visual root stays without a parent; under another kind
   // of control it cannot stand.
   if (dynamic_cast<TControl*>(AParent))
-    throw EInvalidOperation(SControlNotWindowed, detail::DisplayName(AParent), detail::DisplayName(this));
+    throw EInvalidOperation(SControlNotWindowed, DisplayName(AParent), DisplayName(this));
   SetParent(nullptr);
 }
 
@@ -287,13 +282,13 @@ int TWinControl::IndexOfControl(const TControl* Control) const noexcept {
 }
 
 void TWinControl::InsertControl(TControl* AControl) {
-  if (!AControl) throw EInvalidOperation(SControlNotChild, "(none)", detail::DisplayName(this));
+  if (!AControl) throw EInvalidOperation(SControlNotChild, "(none)", DisplayName(this));
   AControl->SetParent(this);
 }
 
 void TWinControl::RemoveControl(TControl* AControl) {
   if (!AControl || AControl->FParent != this)
-    throw EInvalidOperation(SControlNotChild, detail::DisplayName(AControl), detail::DisplayName(this));
+    throw EInvalidOperation(SControlNotChild, DisplayName(AControl), DisplayName(this));
   AControl->SetParent(nullptr);
 }
 
@@ -365,7 +360,7 @@ TControl* TWinControl::ControlAtPos(TPoint Pos, bool AllowDisabled, bool AllowWi
 
 void TWinControl::SetChildZOrder(TControl* Child, int Position) {
   int Index = IndexOfControl(Child);
-  if (Index < 0) throw EInvalidOperation(SControlNotChild, detail::DisplayName(Child), detail::DisplayName(this));
+  if (Index < 0) throw EInvalidOperation(SControlNotChild, DisplayName(Child), DisplayName(this));
   Position = std::clamp(Position, 0, ControlCount() - 1);
   if (Position == Index) return;
   FControls.erase(FControls.begin() + Index);
@@ -403,13 +398,8 @@ void TWinControl::SetTabOrder(int Value) {
 void TWinControl::Realign() {
   if (FAlignLevel > 0 || FAligning || IsLoading() || ComponentState().Contains(csDestroying)) return;
   FAligning = true;
-  try {
-    AlignControls();
-  } catch (...) {
-    FAligning = false;
-    throw;
-  }
-  FAligning = false;
+  auto Done = Finally([this]() noexcept { FAligning = false; });
+  AlignControls();
 }
 
 void TWinControl::EnableAlign() {
@@ -463,15 +453,13 @@ void TWinControl::AlignControls() {
 }
 
 void TWinControl::ChangeScale(int M, int D, int NewPPI) {
-  // The children are laid out once, at the end, from their scaled bounds.
+  // The children are laid out once, at the end, from their scaled bounds; after a
+  // failure they are left where it stopped.
   DisableAlign();
-  try {
-    inherited::ChangeScale(M, D, NewPPI);
-    for (TControl* C : std::vector<TControl*>(FControls)) C->ChangeScale(M, D, NewPPI);
-  } catch (...) {
-    --FAlignLevel;
-    throw;
-  }
+  auto Undo = OnFailure([this]() noexcept { --FAlignLevel; });
+  inherited::ChangeScale(M, D, NewPPI);
+  for (TControl* C : std::vector<TControl*>(FControls)) C->ChangeScale(M, D, NewPPI);
+  Undo.Dismiss();
   EnableAlign();
 }
 

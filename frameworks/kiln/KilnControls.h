@@ -145,7 +145,7 @@ class FK_API TControl : public TComponent, public TMessageTarget {
   TColor Color() const noexcept { return FColor; }
   void SetColor(TColor Value);
   /// The control's font; owned. Changing it turns `ParentFont` off.
-  TFont* Font() const noexcept { return FFont; }
+  TFont* Font() const noexcept { return FFont.Get(); }
   void SetFont(TFont* Value) { FFont->Assign(Value); }
   /// True while the control takes its parent's font.
   bool ParentFont() const noexcept { return FParentFont; }
@@ -210,6 +210,8 @@ protected:
 
 private:
   friend class TWinControl;
+  /// Copies the parent's font into the control's, which stays a parent's font.
+  void TakeParentFont();
   TWinControl* FParent = nullptr;
   int FLeft = 0;
   int FTop = 0;
@@ -224,7 +226,7 @@ private:
   String FHint;
   TColor FColor = clBtnFace;
   TCursor FCursor = crDefault;
-  TFont* FFont = nullptr;
+  TObjectGuard<TFont> FFont;
   TControlStyle FControlStyle;
   int FPPI = DefaultPPI;
 };

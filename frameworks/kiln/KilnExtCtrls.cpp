@@ -95,13 +95,13 @@ void TPanel::Paint(TCanvas* Canvas) {
 // TTimer
 //===----------------------------------------------------------------------===//
 
-namespace detail {
+namespace {
 /// The live timers, for the clock. Immortal, like the message queue.
 std::vector<TTimer*>& Timers() {
   static auto* L = new std::vector<TTimer*>;
   return *L;
 }
-} // namespace detail
+} // namespace
 
 FK_IMPLEMENT(TTimer, "KilnExtCtrls") {
   B.Property("Enabled", &TTimer::Enabled, &TTimer::SetEnabled).Default(true);
@@ -111,11 +111,11 @@ FK_IMPLEMENT(TTimer, "KilnExtCtrls") {
 
 void TTimer::Create(TComponent* AOwner) {
   inherited::Create(AOwner);
-  detail::Timers().push_back(this);
+  Timers().push_back(this);
 }
 
 void TTimer::BeforeDestruction() {
-  std::erase(detail::Timers(), this);
+  std::erase(Timers(), this);
   RemoveMessages(this);
   inherited::BeforeDestruction();
 }
@@ -138,7 +138,7 @@ void TTimer::WndProc(TMessage& Message) {
 
 void AdvanceTimers(int Milliseconds) {
   if (Milliseconds < 0) throw EInvalidOperation(SInvalidTimeStep, Milliseconds);
-  for (TTimer* T : std::vector<TTimer*>(detail::Timers())) {
+  for (TTimer* T : std::vector<TTimer*>(Timers())) {
     if (!T->FEnabled || T->FInterval <= 0) continue;
     T->FElapsed += Milliseconds;
     while (T->FElapsed >= T->FInterval) {

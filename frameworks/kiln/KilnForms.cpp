@@ -14,7 +14,7 @@ FK_RESOURCESTRING(SInvalidMonitor,
                   "Monitor %d is not valid: its bounds must not be empty, its work area must lie "
                   "inside them and its pixels per inch must be at least 1");
 
-namespace detail {
+namespace {
 /// Components a root writes at its own level: those that have no parent to stand under.
 bool IsRootLevel(TComponent* C) { return !C->HasParent() || !C->GetParentComponent(); }
 
@@ -40,7 +40,7 @@ int OwnedControlCount(TWinControl* W, TComponent* Root) {
     if (W->Controls(I)->Owner() == Root) ++N;
   return N;
 }
-} // namespace detail
+} // namespace
 
 //===----------------------------------------------------------------------===//
 // TCustomForm
@@ -132,15 +132,14 @@ void TCustomForm::ChangeScale(int M, int D, int NewPPI) {
   int L = Left();
   int T = Top();
   DisableAlign();
-  try {
-    inherited::ChangeScale(M, D, NewPPI);
-    SetBounds(L, T, Width(), Height());
-    SetClientWidth(W);
-    SetClientHeight(H);
-  } catch (...) {
-    EnableAlign();
-    throw;
-  }
+  // Enabling the layout lays the children out, which may fail: after a failure here that
+  // one passes on, after success its own does.
+  auto End = OnFailure([this]() noexcept { RunIgnoringExceptions([this] { EnableAlign(); }); });
+  inherited::ChangeScale(M, D, NewPPI);
+  SetBounds(L, T, Width(), Height());
+  SetClientWidth(W);
+  SetClientHeight(H);
+  End.Dismiss();
   EnableAlign();
 }
 
@@ -154,13 +153,13 @@ void TCustomForm::Loaded() {
 void TCustomForm::GetChildren(const TGetChildProc& Proc, TComponent* Root) {
   inherited::GetChildren(Proc, Root);
   if (Root == this)
-    for (TComponent* C : detail::RootLevelComponents(this)) Proc(C);
+    for (TComponent* C : RootLevelComponents(this)) Proc(C);
 }
 
 void TCustomForm::SetChildOrder(TComponent* Child, int Order) {
   auto* C = dynamic_cast<TControl*>(Child);
   if (C && C->Parent() == this) inherited::SetChildOrder(Child, Order);
-  else detail::SetRootLevelOrder(this, Child, Order - detail::OwnedControlCount(this, this));
+  else SetRootLevelOrder(this, Child, Order - OwnedControlCount(this, this));
 }
 
 FK_IMPLEMENT(TForm, "KilnForms") {}
@@ -188,13 +187,13 @@ void TCustomFrame::Create(TComponent* AOwner) {
 void TCustomFrame::GetChildren(const TGetChildProc& Proc, TComponent* Root) {
   inherited::GetChildren(Proc, Root);
   if (Root == this)
-    for (TComponent* C : detail::RootLevelComponents(this)) Proc(C);
+    for (TComponent* C : RootLevelComponents(this)) Proc(C);
 }
 
 void TCustomFrame::SetChildOrder(TComponent* Child, int Order) {
   auto* C = dynamic_cast<TControl*>(Child);
   if (C && C->Parent() == this) inherited::SetChildOrder(Child, Order);
-  else detail::SetRootLevelOrder(this, Child, Order - detail::OwnedControlCount(this, this));
+  else SetRootLevelOrder(this, Child, Order - OwnedControlCount(this, this));
 }
 
 FK_IMPLEMENT(TFrame, "KilnForms") {}
@@ -225,10 +224,10 @@ void TDataModule::DefineProperties(TFiler* Filer) {
 }
 
 void TDataModule::GetChildren(const TGetChildProc& Proc, TComponent*) {
-  for (TComponent* C : detail::RootLevelComponents(this)) Proc(C);
+  for (TComponent* C : RootLevelComponents(this)) Proc(C);
 }
 
-void TDataModule::SetChildOrder(TComponent* Child, int Order) { detail::SetRootLevelOrder(this, Child, Order); }
+void TDataModule::SetChildOrder(TComponent* Child, int Order) { SetRootLevelOrder(this, Child, Order); }
 
 //===----------------------------------------------------------------------===//
 // Screen
@@ -261,31 +260,23 @@ void TScreen::RemoveForm(TCustomForm* Form) noexcept {
 
 void TScreen::FormVisibilityChanged(TCustomForm* Form, bool Visible) noexcept {
   std::erase(FShown, Form);
-  if (Visible) {
-    try {
-      FShown.push_back(Form);
-    } catch (...) {
-      // Out of memory: the form is simply not tracked as shown.
-    }
-  }
+  // Out of memory, a form that shows is simply not tracked as shown.
+  if (Visible) RunIgnoringExceptions([&] { FShown.push_back(Form); });
   FActiveForm = FShown.empty() ? nullptr : FShown.back();
 }
 
 TMonitor* TScreen::Monitors(int Index) const {
   if (Index < 0 || Index >= MonitorCount()) throw EListError(SMonitorIndexError, Index);
-  return FMonitors[static_cast<std::size_t>(Index)];
+  return FMonitors[static_cast<std::size_t>(Index)].Get();
 }
 
 TMonitor* TScreen::PrimaryMonitor() const {
-  for (TMonitor* M : FMonitors)
-    if (M->Primary()) return M;
-  return FMonitors.front();
+  for (const TObjectGuard<TMonitor>& M : FMonitors)
+    if (M->Primary()) return M.Get();
+  return FMonitors.front().Get();
 }
 
-void TScreen::ClearMonitors() noexcept {
-  for (TMonitor* M : FMonitors) M->Destroy();
-  FMonitors.clear();
-}
+void TScreen::ClearMonitors() noexcept { FMonitors.clear(); }
 
 void TScreen::SetMonitors(const std::vector<TMonitorInfo>& Monitors) {
   if (Monitors.empty()) throw EInvalidOperation(SNoMonitors);
@@ -299,55 +290,51 @@ void TScreen::SetMonitors(const std::vector<TMonitorInfo>& Monitors) {
       throw EInvalidOperation(SInvalidMonitor, static_cast<int>(I));
     AnyPrimary = AnyPrimary || M.Primary;
   }
-  std::vector<TMonitor*> Made;
-  try {
-    for (std::size_t I = 0; I < Monitors.size(); ++I) {
-      auto* M = new TMonitor;
-      Made.push_back(M);
-      M->FNum = static_cast<int>(I);
-      M->FInfo = Monitors[I];
-      // Exactly one primary: the first one marked, or the first one.
-      bool Primary = AnyPrimary ? Monitors[I].Primary : I == 0;
-      for (TMonitor* Earlier : Made)
-        if (Earlier != M && Earlier->FInfo.Primary) Primary = false;
-      M->FInfo.Primary = Primary;
-    }
-  } catch (...) {
-    for (TMonitor* M : Made) M->Destroy();
-    throw;
+  std::vector<TObjectGuard<TMonitor>> Made;
+  Made.reserve(Monitors.size());
+  for (std::size_t I = 0; I < Monitors.size(); ++I) {
+    TObjectGuard<TMonitor> M(new TMonitor);
+    M->FNum = static_cast<int>(I);
+    M->FInfo = Monitors[I];
+    // Exactly one primary: the first one marked, or the first one.
+    bool Primary = AnyPrimary ? Monitors[I].Primary : I == 0;
+    for (const TObjectGuard<TMonitor>& Earlier : Made)
+      if (Earlier->FInfo.Primary) Primary = false;
+    M->FInfo.Primary = Primary;
+    Made.push_back(std::move(M));
   }
   ClearMonitors();
   FMonitors = std::move(Made);
 }
 
-namespace detail {
+namespace {
 long long DistanceSquared(const TRect& R, TPoint P) {
   long long DX = P.X < R.Left ? R.Left - P.X : (P.X >= R.Right ? P.X - (R.Right - 1) : 0);
   long long DY = P.Y < R.Top ? R.Top - P.Y : (P.Y >= R.Bottom ? P.Y - (R.Bottom - 1) : 0);
   return DX * DX + DY * DY;
 }
-} // namespace detail
+} // namespace
 
 TMonitor* TScreen::MonitorFromPoint(TPoint P, TMonitorDefaultTo Default) const {
-  for (TMonitor* M : FMonitors)
-    if (M->BoundsRect().Contains(P)) return M;
+  for (const TObjectGuard<TMonitor>& M : FMonitors)
+    if (M->BoundsRect().Contains(P)) return M.Get();
   if (Default == mdNull) return nullptr;
   if (Default == mdPrimary) return PrimaryMonitor();
-  TMonitor* Best = FMonitors.front();
-  for (TMonitor* M : FMonitors)
-    if (detail::DistanceSquared(M->BoundsRect(), P) < detail::DistanceSquared(Best->BoundsRect(), P)) Best = M;
+  TMonitor* Best = FMonitors.front().Get();
+  for (const TObjectGuard<TMonitor>& M : FMonitors)
+    if (DistanceSquared(M->BoundsRect(), P) < DistanceSquared(Best->BoundsRect(), P)) Best = M.Get();
   return Best;
 }
 
 TMonitor* TScreen::MonitorFromRect(const TRect& R, TMonitorDefaultTo Default) const {
   TMonitor* Best = nullptr;
   long long BestArea = 0;
-  for (TMonitor* M : FMonitors) {
+  for (const TObjectGuard<TMonitor>& M : FMonitors) {
     TRect I;
     if (!IntersectRect(I, R, M->BoundsRect())) continue;
     long long Area = static_cast<long long>(I.Width()) * I.Height();
     if (Area > BestArea) {
-      Best = M;
+      Best = M.Get();
       BestArea = Area;
     }
   }
@@ -358,21 +345,23 @@ TMonitor* TScreen::MonitorFromRect(const TRect& R, TMonitorDefaultTo Default) co
 
 TRect TScreen::DesktopRect() const {
   TRect R;
-  for (TMonitor* M : FMonitors) R = UnionRect(R, M->BoundsRect());
+  for (const TObjectGuard<TMonitor>& M : FMonitors) R = UnionRect(R, M->BoundsRect());
   return R;
 }
 
-namespace detail {
+namespace {
 TScreen*& ScreenInstance() {
   static TScreen* S = nullptr;
   return S;
 }
+} // namespace
 
+namespace detail {
 void FreeScreen() noexcept { FreeAndNil(ScreenInstance()); }
 } // namespace detail
 
 TScreen* Screen() {
-  TScreen*& S = detail::ScreenInstance();
+  TScreen*& S = ScreenInstance();
   if (!S) S = new TScreen;
   return S;
 }

@@ -237,7 +237,7 @@ private:
   std::vector<TCustomForm*> FForms;
   std::vector<TCustomForm*> FShown; // visible forms, the last shown last
   TCustomForm* FActiveForm = nullptr;
-  std::vector<TMonitor*> FMonitors;
+  std::vector<TObjectGuard<TMonitor>> FMonitors;
   TCursor FCursor = crDefault;
 };
 

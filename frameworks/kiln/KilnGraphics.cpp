@@ -10,7 +10,7 @@ FK_RESOURCESTRING(SInvalidPenWidth, "Pen width %d is not valid: a pen is at leas
 // Colours
 //===----------------------------------------------------------------------===//
 
-namespace detail {
+namespace {
 struct TColorName {
   TColor Value;
   const char* Name;
@@ -57,10 +57,10 @@ const TColorName ColorNames[] = {
     {clNone, "clNone", clNone},
     {clDefault, "clDefault", clDefault},
 };
-} // namespace detail
+} // namespace
 
 bool ColorToIdent(TColor Color, String& Ident) {
-  for (const auto& C : detail::ColorNames)
+  for (const auto& C : ColorNames)
     if (C.Value == Color) {
       Ident = C.Name;
       return true;
@@ -69,7 +69,7 @@ bool ColorToIdent(TColor Color, String& Ident) {
 }
 
 bool IdentToColor(std::string_view Ident, TColor& Color) {
-  for (const auto& C : detail::ColorNames)
+  for (const auto& C : ColorNames)
     if (SameText(C.Name, Ident)) {
       Color = C.Value;
       return true;
@@ -95,13 +95,13 @@ TColor StringToColor(std::string_view Text) {
 
 TColor ColorToRGB(TColor Color) {
   if ((Color & clSystemColor) != clSystemColor) return Color;
-  for (const auto& C : detail::ColorNames)
+  for (const auto& C : ColorNames)
     if (C.Value == Color) return C.Rgb;
   return clBlack;
 }
 
 void GetColorValues(const std::function<void(const String& Name)>& Proc) {
-  for (const auto& C : detail::ColorNames) Proc(C.Name);
+  for (const auto& C : ColorNames) Proc(C.Name);
 }
 
 //===----------------------------------------------------------------------===//
@@ -242,9 +242,9 @@ FK_IMPLEMENT(TCanvas, "KilnGraphics") {}
 TCanvas::TCanvas() : FFont(new TFont), FPen(new TPen), FBrush(new TBrush) {}
 
 void TCanvas::BeforeDestruction() {
-  FreeAndNil(FFont);
-  FreeAndNil(FPen);
-  FreeAndNil(FBrush);
+  FFont.Reset();
+  FPen.Reset();
+  FBrush.Reset();
   inherited::BeforeDestruction();
 }
 

@@ -183,9 +183,10 @@ class FK_API TCanvas : public TPersistent {
   TCanvas();
   void BeforeDestruction() override;
 
-  TFont* Font() const noexcept { return FFont; }
-  TPen* Pen() const noexcept { return FPen; }
-  TBrush* Brush() const noexcept { return FBrush; }
+  /// The canvas's own font, pen and brush.
+  TFont* Font() const noexcept { return FFont.Get(); }
+  TPen* Pen() const noexcept { return FPen.Get(); }
+  TBrush* Brush() const noexcept { return FBrush.Get(); }
   TPoint PenPos() const noexcept { return FPenPos; }
 
   /// Records "MoveTo(X,Y)".
@@ -224,9 +225,9 @@ class FK_API TCanvas : public TPersistent {
 
 private:
   void Record(String Line);
-  TFont* FFont = nullptr;
-  TPen* FPen = nullptr;
-  TBrush* FBrush = nullptr;
+  TObjectGuard<TFont> FFont;
+  TObjectGuard<TPen> FPen;
+  TObjectGuard<TBrush> FBrush;
   TPoint FPenPos;
   int FPixelsPerInch = 96;
   std::vector<String> FLines;

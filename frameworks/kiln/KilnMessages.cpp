@@ -8,7 +8,7 @@ namespace formkit {
 
 FK_RESOURCESTRING(SNoMessageTarget, "A message needs a target");
 
-namespace detail {
+namespace {
 struct TQueuedMessage {
   TMessageTarget* Target;
   TMessage Message;
@@ -19,7 +19,7 @@ std::deque<TQueuedMessage>& MessageQueue() {
   static auto* Queue = new std::deque<TQueuedMessage>;
   return *Queue;
 }
-} // namespace detail
+} // namespace
 
 std::intptr_t SendMessage(TMessageTarget* Target, std::uint32_t Msg, std::intptr_t WParam,
                           std::intptr_t LParam) {
@@ -31,15 +31,15 @@ std::intptr_t SendMessage(TMessageTarget* Target, std::uint32_t Msg, std::intptr
 
 void PostMessage(TMessageTarget* Target, std::uint32_t Msg, std::intptr_t WParam, std::intptr_t LParam) {
   if (!Target) throw EInvalidOperation(SNoMessageTarget);
-  detail::MessageQueue().push_back({Target, TMessage{Msg, WParam, LParam, 0}});
+  MessageQueue().push_back({Target, TMessage{Msg, WParam, LParam, 0}});
 }
 
 bool HandleMessage() {
-  auto& Queue = detail::MessageQueue();
+  auto& Queue = MessageQueue();
   if (Queue.empty()) return false;
   // Taken off the queue before delivery: the handler may post, remove or destroy its
   // own target, and nothing touches the target after the handler returns.
-  detail::TQueuedMessage Q = Queue.front();
+  TQueuedMessage Q = Queue.front();
   Queue.pop_front();
   Q.Target->WndProc(Q.Message);
   return true;
@@ -52,17 +52,17 @@ int ProcessMessages() {
 }
 
 int RemoveMessages(TMessageTarget* Target) noexcept {
-  auto& Queue = detail::MessageQueue();
+  auto& Queue = MessageQueue();
   auto Before = Queue.size();
-  std::erase_if(Queue, [Target](const detail::TQueuedMessage& Q) { return Q.Target == Target; });
+  std::erase_if(Queue, [Target](const TQueuedMessage& Q) { return Q.Target == Target; });
   return static_cast<int>(Before - Queue.size());
 }
 
 int PendingMessageCount(TMessageTarget* Target) noexcept {
-  auto& Queue = detail::MessageQueue();
+  auto& Queue = MessageQueue();
   if (!Target) return static_cast<int>(Queue.size());
   return static_cast<int>(
-      std::count_if(Queue.begin(), Queue.end(), [Target](const detail::TQueuedMessage& Q) { return Q.Target == Target; }));
+      std::count_if(Queue.begin(), Queue.end(), [Target](const TQueuedMessage& Q) { return Q.Target == Target; }));
 }
 
 } // namespace formkit

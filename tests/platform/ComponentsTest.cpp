@@ -44,7 +44,7 @@ TEST(Construction, AThrowingConstructorLeavesNothingBehind) {
   EXPECT_EQ(Owner->ComponentCount(), 0);
   Owner->Destroy();
 
-  EXPECT_EQ(MessageOf<EInvalidOperation>([] { TStrings::StaticClass()->NewInstance(); }),
+  EXPECT_EQ(MessageOf<EInvalidOperation>([] { (void)TStrings::StaticClass()->NewInstance(); }),
             "Cannot create an instance of abstract class TStrings");
   EXPECT_EQ(MessageOf<EComponentError>([] { CreateComponent(TStringList::StaticClass(), nullptr); }),
             "Class TStringList is not a component class");
@@ -168,7 +168,8 @@ TEST(Registry, ClassesByNameAndGroups) {
 
   // A group of its own for the listener family: its classes are found only while active.
   StartClassGroup(TListener::StaticClass());
-  TClass Special = TClassRec::NewGeneratedClass(TListener::StaticClass(), "TSpecial", "Unit2");
+  TGeneratedClass SpecialRecord = TClassRec::NewGeneratedClass(TListener::StaticClass(), "TSpecial", "Unit2");
+  TClass Special = SpecialRecord.get();
   RegisterClass(Special);
   EXPECT_EQ(ClassGroupOf(Special), TListener::StaticClass());
   EXPECT_EQ(ClassGroupOf(TSampleWidget::StaticClass()), TPersistent::StaticClass());
@@ -184,14 +185,13 @@ TEST(Registry, ClassesByNameAndGroups) {
   EXPECT_EQ(ActivateClassGroup(Previous), TListener::StaticClass());
   EXPECT_EQ(CurrentClassGroup(), TPersistent::StaticClass());
 
-  TClass Clash = TClassRec::NewGeneratedClass(TListener::StaticClass(), "TSpecial", "Unit3");
+  TGeneratedClass ClashRecord = TClassRec::NewGeneratedClass(TListener::StaticClass(), "TSpecial", "Unit3");
+  TClass Clash = ClashRecord.get();
   EXPECT_EQ(MessageOf<EComponentError>([&] { RegisterClass(Clash); }), "A class named TSpecial already exists");
   UnRegisterClass(Special);
   ActivateClassGroup(TListener::StaticClass());
   EXPECT_EQ(GetClass("TSpecial"), nullptr);
   ActivateClassGroup(Previous);
-  TClassRec::DisposeGeneratedClass(Clash);
-  TClassRec::DisposeGeneratedClass(Special);
 }
 
 namespace {

@@ -209,6 +209,82 @@ TEST_F(WidgetFixture, EventsBindPublishedMethodsByNameAndCarryTheirSignature) {
   EXPECT_EQ(W->LastX, 9);
 }
 
+namespace {
+
+FK_ALIAS(TShortText, tkString)
+FK_ALIAS(TAnsiText, tkLString)
+FK_ALIAS(TTextAsVariant, tkVariant)
+
+/// Text in each string kind, and properties of other kinds for the refusals.
+class TTextHolder : public TPersistent {
+  FK_CLASS(TTextHolder, TPersistent)
+  String FShort, FAnsi, FText, FOdd;
+  WideString FWide;
+  int FCount = 7;
+  String Fixed() const { return "fixed"; }
+};
+FK_IMPLEMENT(TTextHolder, "Tests") {
+  B.Field("Short", &TTextHolder::FShort).Type(&TypeInfo_TShortText);
+  B.Field("Ansi", &TTextHolder::FAnsi).Type(&TypeInfo_TAnsiText);
+  B.Field("Text", &TTextHolder::FText);
+  B.Field("Wide", &TTextHolder::FWide);
+  B.Field("Odd", &TTextHolder::FOdd).Type(&TypeInfo_TTextAsVariant);
+  B.Field("Count", &TTextHolder::FCount);
+  B.Property("Fixed", &TTextHolder::Fixed);
+}
+
+} // namespace
+
+TEST(AnsiStringAccess, EveryTextKindCarriesTheSameUtf8BytesAndOthersAreRefused) {
+  TObjectGuard<TTextHolder> H(new TTextHolder);
+  auto Prop = [&](const char* Name) { return GetPropInfo(H.Get(), Name); };
+  EXPECT_EQ(Prop("Short")->Kind(), tkString);
+  EXPECT_EQ(Prop("Ansi")->Kind(), tkLString);
+  EXPECT_EQ(Prop("Text")->Kind(), tkUString);
+  EXPECT_EQ(Prop("Wide")->Kind(), tkWString);
+
+  // Letters beyond Latin-1, a sign beyond 8 bits and one beyond 16: nothing is narrowed.
+  const String Text = "Gr\xC3\xBC\xC3\x9F" "e \xE2\x82\xAC \xF0\x9F\x98\x80";
+  for (const char* Name : {"Short", "Ansi", "Text", "Wide"}) {
+    SetAnsiStrProp(H.Get(), Prop(Name), Text);
+    EXPECT_EQ(GetAnsiStrProp(H.Get(), Prop(Name)), Text) << Name;
+    EXPECT_EQ(GetStrProp(H.Get(), Prop(Name)), Text) << Name;
+  }
+  EXPECT_EQ(H->FAnsi, Text);
+  EXPECT_EQ(H->FWide, u"Gr\u00FC\u00DFe \u20AC \U0001F600");
+  SetStrProp(H.Get(), Prop("Wide"), "plain");
+  EXPECT_EQ(GetAnsiStrProp(H.Get(), Prop("Wide")), "plain");
+
+  // A property of another kind is refused both ways and keeps its value, even a text
+  // field whose type record names another kind.
+  for (const char* Name : {"Count", "Odd"}) {
+    String Expected = String("Invalid property type: ") + (Name == String("Count") ? "Integer" : "TTextAsVariant");
+    try {
+      SetAnsiStrProp(H.Get(), Prop(Name), "8");
+      ADD_FAILURE() << Name;
+    } catch (const EPropertyConvertError& E) {
+      EXPECT_EQ(E.Message(), Expected);
+    }
+    try {
+      (void)GetAnsiStrProp(H.Get(), Prop(Name));
+      ADD_FAILURE() << Name;
+    } catch (const EPropertyConvertError& E) {
+      EXPECT_EQ(E.Message(), Expected);
+    }
+  }
+  EXPECT_EQ(H->FCount, 7);
+  EXPECT_EQ(H->FOdd, "");
+
+  // A read-only text reads and refuses a write with the property's name.
+  EXPECT_EQ(GetAnsiStrProp(H.Get(), Prop("Fixed")), "fixed");
+  try {
+    SetAnsiStrProp(H.Get(), Prop("Fixed"), "other");
+    FAIL();
+  } catch (const EPropertyError& E) {
+    EXPECT_EQ(E.Message(), "Property Fixed is read-only");
+  }
+}
+
 TEST(ClassRecords, NamesInheritanceAndGeneratedClasses) {
   TClass C = TSampleWidget::StaticClass();
   EXPECT_EQ(C->ClassName, "TSampleWidget");
@@ -221,7 +297,8 @@ TEST(ClassRecords, NamesInheritanceAndGeneratedClasses) {
 
   // A record made at run time on a compiled parent: own names and methods, the
   // parent's properties and C++ type, hooks at destruction and notification.
-  TClass Gen = TClassRec::NewGeneratedClass(C, "TForm1", "Unit1");
+  TGeneratedClass GenRecord = TClassRec::NewGeneratedClass(C, "TForm1", "Unit1");
+  TClass Gen = GenRecord.get();
   Gen->Methods.push_back({"Button1Click", reinterpret_cast<void*>(std::uintptr_t(3)), nullptr, nullptr});
   int Destroyed = 0, Notified = 0;
   Gen->OnDestroy = [&](TObject*) { ++Destroyed; };
@@ -255,5 +332,4 @@ TEST(ClassRecords, NamesInheritanceAndGeneratedClasses) {
   EXPECT_THROW(Obj->SetClassType(TListener::StaticClass()), EInvalidCast);
   Obj->Destroy();
   EXPECT_EQ(Destroyed, 1);
-  TClassRec::DisposeGeneratedClass(Gen);
 }

@@ -269,7 +269,7 @@ class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSur
   void KeyDown(TDesignKeyCode Key, TShiftState Shift = {}, char Ch = 0);
 
   /// Where feedback is drawn: drag boxes, handles, icons.
-  TCanvas* Canvas() noexcept { return FCanvas; }
+  TCanvas* Canvas() noexcept { return FCanvas.Get(); }
   TKilnRoot* Root() const noexcept { return FRoot; }
   TWinControl* Container() const noexcept { return FContainer; }
   /// The item of a component of the module.
@@ -319,7 +319,7 @@ private:
   TWinControl* FContainer = nullptr; // the root's window (a form, or the window of a frame)
   IPtr<IDesignSurfaceListener> FListener;
   IPtr<TKilnGrabHandles> FHandles;
-  TCanvas* FCanvas; // owned
+  TObjectGuard<TCanvas> FCanvas;
   TDesignSurfaceOptions FOptions;
   TPoint FCursor;
   bool FFocused = false;

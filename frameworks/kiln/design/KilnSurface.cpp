@@ -80,7 +80,7 @@ TKilnSurface::TKilnSurface(TKilnRoot* Root, TWinControl* Container)
 
 void TKilnSurface::BeforeDestruction() {
   FHandles = nullptr;
-  FreeAndNil(FCanvas);
+  FCanvas.Reset();
   inherited::BeforeDestruction();
 }
 
@@ -131,7 +131,7 @@ IPtr<IItem> TKilnSurface::ItemAtPoint(int X, int Y) {
 }
 
 IPtr<IDragBoxes> TKilnSurface::BeginDrag(const IPtr<IItem>&, const TPoint&) {
-  return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas);
+  return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas.Get());
 }
 
 IPtr<IItem> TKilnSurface::CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) {

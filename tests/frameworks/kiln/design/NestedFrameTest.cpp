@@ -9,6 +9,7 @@ using namespace formkit::fakes;
 struct NestedFrameTest : KilnDesignFixture {
   IPtr<IRoot> FrameModule;
   IPtr<IRoot> FormModule;
+  TGeneratedClass ProxyRecord;
   TClass Proxy = nullptr;
   std::vector<String> Calls;
 
@@ -21,7 +22,8 @@ struct NestedFrameTest : KilnDesignFixture {
     KilnRoot(FrameModule)->CreateComponent(TButton::StaticClass(), FrameModule->GetRoot(), 8, 8, 75, 25);
     FormModule = NewForm("Form1");
     // The class a module stands for when it is nested: what the inheritance support makes.
-    Proxy = TClassRec::NewGeneratedClass(TFrame::StaticClass(), "TFrame1", "Frame1");
+    ProxyRecord = TClassRec::NewGeneratedClass(TFrame::StaticClass(), "TFrame1", "Frame1");
+    Proxy = ProxyRecord.get();
     TRootHooks::IsProxyClass = [this](TClass C) { return C == Proxy; };
     TRootHooks::ChangeToProxyClass = [this](TComponent* Instance, TClass Class) {
       Calls.push_back("ChangeToProxyClass(" + Class->ClassName + ")");
@@ -34,7 +36,7 @@ struct NestedFrameTest : KilnDesignFixture {
     TRootHooks::ReadObjectFromStream = nullptr;
     FrameModule = FormModule = nullptr;
     KilnDesignFixture::TearDown();
-    TClassRec::DisposeGeneratedClass(Proxy);
+    ProxyRecord.reset();
   }
   void ReadWithTheReader() {
     TRootHooks::ReadObjectFromStream = [this](TComponentRoot&, TComponent* Instance, TStream* Stream) {
@@ -87,11 +89,12 @@ TEST_F(NestedFrameTest, WhatCannotBeNestedIsRefusedAndLeavesNothing) {
   EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(Proxy, FrameModule->GetRoot()); }),
             "A nested component cannot be inserted into itself");
   // A form module does not nest.
-  TClass FormProxy = TClassRec::NewGeneratedClass(TForm::StaticClass(), "TForm1", "Form1");
+  TGeneratedClass FormProxyRecord = TClassRec::NewGeneratedClass(TForm::StaticClass(), "TForm1", "Form1");
+  TClass FormProxy = FormProxyRecord.get();
   TRootHooks::IsProxyClass = [&](TClass C) { return C == Proxy || C == FormProxy; };
   EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(FormProxy, Root); }),
             "Cannot paste a form or datamodule into another form or datamodule");
-  TClassRec::DisposeGeneratedClass(FormProxy);
+  FormProxyRecord.reset();
   // Without the reader of modules the instance goes again.
   EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(Proxy, Root); }),
             "Reading a nested frame is not available");
