@@ -404,6 +404,9 @@ private:
   /// the order a reader will have them in, to decide on `ffChildPos`.
   detail::TChildList* FChildren = nullptr;
   std::size_t FChildPos = 0;
+  /// The component being written is inherited, but stands under another parent than in
+  /// the ancestor: the reader will move it, like a new child, to the end of this parent.
+  bool FAncestorMoved = false;
 };
 
 //===----------------------------------------------------------------------===//

@@ -502,15 +502,21 @@ void TWriter::WriteDescendent(TComponent* ARoot, TComponent* AAncestor) {
 }
 
 void TWriter::WriteComponent(TComponent* Component) {
-  auto Restore = Finally([this, Component, OldAncestor = FAncestor, OldRootAncestor = FRootAncestor]() noexcept {
+  auto Restore = Finally([this, Component, OldAncestor = FAncestor, OldRootAncestor = FRootAncestor,
+                          OldMoved = FAncestorMoved]() noexcept {
     FAncestor = OldAncestor;
     FRootAncestor = OldRootAncestor;
+    FAncestorMoved = OldMoved;
     Component->SetWriting(false);
   });
   Component->SetWriting(true);
+  FAncestorMoved = false;
   if (FChildren) {
     auto It = FChildren->ByName.find(UpperCase(Component->Name()));
     FAncestor = It != FChildren->ByName.end() && !Component->Name().empty() ? It->second : nullptr;
+    // Every component the ancestor has is inherited, also one moved to another parent.
+    if (!FAncestor && FRootAncestor && !Component->Name().empty())
+      if ((FAncestor = FRootAncestor->FindComponent(Component->Name()))) FAncestorMoved = true;
   } else if (Component != FRoot) {
     FAncestor = nullptr;
   }
@@ -552,7 +558,7 @@ bool TWriter::TakesChildPosition(TComponent* Instance) {
   // does not stand where the reader will have it is moved there.
   auto& Order = FChildren->Order;
   const void* Key = FAncestor ? static_cast<const void*>(FAncestor) : static_cast<const void*>(Instance);
-  if (!FAncestor) Order.push_back(Key);
+  if (!FAncestor || FAncestorMoved) Order.push_back(Key);
   if (FChildPos < Order.size() && Order[FChildPos] == Key) return false;
   auto It = std::find(Order.begin(), Order.end(), Key);
   if (It == Order.end()) return false;

@@ -154,3 +154,24 @@ TEST(ComponentReferences, APlainReferenceThatOutlivesItsComponentIsReportedAndSa
   Held = nullptr;
   Second = nullptr;
 }
+
+//===----------------------------------------------------------------------===//
+// Descendants
+//===----------------------------------------------------------------------===//
+
+TEST(ReaderSafety, AnInheritedComponentMovedToAnotherParentStaysInheritedAndReopens) {
+  TObjectGuard<TTestForm> Ancestor(BuildRichForm());
+  std::vector<std::uint8_t> AncestorBytes = WriteBytes(Ancestor.Get());
+  TObjectGuard<TComponent> Form(ReadBytes(AncestorBytes));
+  // Button2 leaves Panel1 for the form itself.
+  auto* Button2 = Ctl(Form.Get(), "Button2");
+  Button2->SetParentComponent(Form.Get());
+  std::vector<std::uint8_t> Bytes = WriteBytes(Form.Get(), Ancestor.Get());
+  String Text = BinaryToText(Bytes);
+  EXPECT_NE(String::npos, Text.find("  inherited Button2: TTestControl"));
+  EXPECT_EQ(String::npos, Text.find("object Button2"));
+  // Read over a fresh copy of the ancestor, as a descendant opens: the same tree again.
+  TObjectGuard<TComponent> Again(ReadBytes(Bytes, ReadBytes(AncestorBytes)));
+  EXPECT_EQ(Again.Get(), Ctl(Again.Get(), "Button2")->FParent);
+  EXPECT_EQ(Bytes, WriteBytes(Again.Get(), Ancestor.Get()));
+}
