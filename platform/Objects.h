@@ -333,9 +333,10 @@ private:
 
 /// Creates a counted object and returns the one reference to it.
 template <class T, class... A> IPtr<T> New(A&&... Args) {
-  T* P = new T(std::forward<A>(Args)...);
-  P->AfterConstruction();
-  return IPtr<T>::Adopt(P);
+  // Held from the start, so that an `AfterConstruction` that raises frees the object.
+  IPtr<T> Obj = IPtr<T>::Adopt(new T(std::forward<A>(Args)...));
+  Obj->AfterConstruction();
+  return Obj;
 }
 
 
