@@ -345,7 +345,8 @@ int CompareText(std::string_view A, std::string_view B) noexcept {
 }
 
 bool SameText(std::string_view A, std::string_view B) noexcept {
-  return A.size() == B.size() && CompareText(A, B) == 0;
+  // Names mostly come back as they were written: equal bytes settle it without folding.
+  return A.size() == B.size() && (A == B || CompareText(A, B) == 0);
 }
 
 String UpperCase(std::string_view S) {

@@ -4,6 +4,7 @@
 #include "platform/Filer.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace formkit {
 
@@ -407,15 +408,19 @@ void TWinControl::EnableAlign() {
 }
 
 void TWinControl::AlignControls() {
+  // One pass over the children: most are not aligned, and a parent may have very many.
+  std::vector<TControl*> Aligned;
+  for (TControl* C : FControls) {
+    if (C->Align() == alNone) continue;
+    if (!C->Visible() && !(C->IsDesigning() && !C->ControlStyle().Contains(csNoDesignVisible))) continue;
+    Aligned.push_back(C);
+  }
+  if (Aligned.empty()) return;
   TRect R = AlignRect();
   std::vector<TControl*> Group;
   for (TAlign A : {alTop, alBottom, alLeft, alRight, alClient}) {
     Group.clear();
-    for (TControl* C : FControls) {
-      if (C->Align() != A) continue;
-      if (!C->Visible() && !(C->IsDesigning() && !C->ControlStyle().Contains(csNoDesignVisible))) continue;
-      Group.push_back(C);
-    }
+    std::copy_if(Aligned.begin(), Aligned.end(), std::back_inserter(Group), [A](TControl* C) { return C->Align() == A; });
     // Controls of one edge keep the order in which they stand along it.
     std::stable_sort(Group.begin(), Group.end(), [A](TControl* X, TControl* Y) {
       switch (A) {
