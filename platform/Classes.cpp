@@ -319,6 +319,10 @@ void TComponent::DestroyComponents() {
 void TComponent::SetName(const String& NewName) {
   if (FName == NewName) return;
   if (!NewName.empty() && !IsValidIdent(NewName)) throw EComponentError(SInvalidName, NewName);
+  // An owner may not take the name of one of its components: references would not know
+  // which is meant.
+  if (!NewName.empty() && !SameText(FName, NewName) && FindComponent(NewName))
+    throw EComponentError(SDuplicateName, NewName);
   if (FOwner) FOwner->ValidateRename(this, FName, NewName);
   else ValidateRename(nullptr, FName, NewName);
   ChangeName(NewName);
@@ -334,6 +338,8 @@ void TComponent::ValidateRename(TComponent* Component, const String& CurName, co
   if (Component && !NewName.empty() && !SameText(CurName, NewName)) {
     TComponent* Existing = FindComponent(NewName);
     if (Existing && Existing != Component) throw EComponentError(SDuplicateName, NewName);
+    // A reference by that name would mean the owner: the name is taken.
+    if (SameText(NewName, FName)) throw EComponentError(SDuplicateName, NewName);
   }
   if (IsDesigning())
     if (IPtr<IDesignerNotify> Designer = FindRootDesigner(this)) Designer->ValidateRename(Component, CurName, NewName);

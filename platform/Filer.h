@@ -294,6 +294,9 @@ private:
   /// Frees what this read created from `LoadedIndex` on, after putting back what it found
   /// and moved; their pending references go too.
   void DropCreatedAfter(std::size_t LoadedIndex) noexcept;
+  /// `ReadFloat` for a value given to an object: a non-finite number is an invalid value.
+  double ReadFiniteFloat();
+  void ReadFloatProp(TPersistent* Instance, PPropInfo Prop);
   static void RestoreParent(const detail::TLoadedEntry& Entry) noexcept;
   /// Takes the loading and reading flags off everything this read holds, after a failure.
   void ClearLoadingFlags() noexcept;
@@ -382,6 +385,7 @@ class FK_API TWriter : public TFiler {
                             bool HasData) override;
 
 private:
+  void WriteFloatTagged(TValueType Tag, double Value);
   void WriteProperty(TPersistent* Instance, PPropInfo Prop);
   /// A class property: a collection's items, a sub-object's properties, or a reference.
   void WriteObjectProperty(TPersistent* Instance, PPropInfo Prop);

@@ -9,6 +9,7 @@
 #include "platform/Filer.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstring>
 #include <unordered_set>
 
@@ -292,6 +293,25 @@ double TReader::ReadFloat() {
 
 double TReader::ReadDate() { return ReadFloat(); }
 
+void TReader::ReadFloatProp(TPersistent* Instance, PPropInfo Prop) {
+  double Value = ReadFiniteFloat();
+  double Old = GetFloatProp(Instance, Prop);
+  SetFloatProp(Instance, Prop, Value);
+  // A number too large for a narrower property turns infinite there: refuse it and keep
+  // what was there.
+  if (!std::isfinite(GetFloatProp(Instance, Prop))) {
+    SetFloatProp(Instance, Prop, Old);
+    throw EReadError(SInvalidPropertyValue);
+  }
+}
+
+double TReader::ReadFiniteFloat() {
+  // A value that no form file can hold (not a number, infinite) is not given to an object.
+  double D = ReadFloat();
+  if (!std::isfinite(D)) throw EReadError(SInvalidPropertyValue);
+  return D;
+}
+
 bool TReader::ReadBoolean() {
   TValueType T = ReadValue();
   if (T == vaTrue) return true;
@@ -329,8 +349,8 @@ TVariant TReader::ReadVariant() {
   case vaInt16:
   case vaInt32: return TVariant(ReadInteger());
   case vaInt64: return TVariant(ReadInt64());
-  case vaDouble: return TVariant(ReadFloat());
-  case vaDate: return TVariant::Date(ReadFloat());
+  case vaDouble: return TVariant(ReadFiniteFloat());
+  case vaDate: return TVariant::Date(ReadFiniteFloat());
   case vaString:
   case vaLString: return TVariant(ReadString());
   case vaFalse:
@@ -565,7 +585,7 @@ void TReader::ReadPropValue(TPersistent* Instance, PPropInfo Prop) {
   case tkEnumeration: ReadEnumValue(*this, Instance, Prop, Type); break;
   case tkSet: ReadSetValue(*this, Instance, Prop, Type); break;
   case tkInt64: SetInt64Prop(Instance, Prop, ReadInt64()); break;
-  case tkFloat: SetFloatProp(Instance, Prop, ReadFloat()); break;
+  case tkFloat: ReadFloatProp(Instance, Prop); break;
   case tkString:
   case tkLString:
   case tkWString:

@@ -118,6 +118,8 @@ public:
       if constexpr (IsSet<V>::value) return static_cast<std::int64_t>(Value.Mask());
       else if constexpr (std::is_pointer_v<V>)
         return static_cast<std::int64_t>(reinterpret_cast<std::intptr_t>(static_cast<TObject*>(Value)));
+      // A character is a code unit of 0 to 255 whatever the sign of `char` here.
+      else if constexpr (std::is_same_v<V, char>) return static_cast<unsigned char>(Value);
       else return static_cast<std::int64_t>(Value);
     } else return TPropAccess::GetOrd(O);
   }

@@ -18,6 +18,7 @@ namespace formkit {
 namespace {
 FK_RESOURCESTRING(SNameTooLong, "Name too long to write: %s");
 FK_RESOURCESTRING(SValueTooLong, "Value too long to write");
+FK_RESOURCESTRING(SInvalidFloatToWrite, "Invalid floating point value to write");
 } // namespace
 
 namespace detail {
@@ -261,15 +262,14 @@ void TWriter::WriteInt64(std::int64_t Value) {
   WriteLE<std::int64_t>(this, Value);
 }
 
-void TWriter::WriteFloat(double Value) {
-  WriteValue(vaDouble);
-  std::uint64_t Bits;
-  std::memcpy(&Bits, &Value, sizeof Bits);
-  WriteLE<std::uint64_t>(this, Bits);
-}
+void TWriter::WriteFloat(double Value) { WriteFloatTagged(vaDouble, Value); }
 
-void TWriter::WriteDate(double Value) {
-  WriteValue(vaDate);
+void TWriter::WriteDate(double Value) { WriteFloatTagged(vaDate, Value); }
+
+void TWriter::WriteFloatTagged(TValueType Tag, double Value) {
+  // A form file carries finite numbers only: what could not be read back is not written.
+  if (!std::isfinite(Value)) throw EWriteError(SInvalidFloatToWrite);
+  WriteValue(Tag);
   std::uint64_t Bits;
   std::memcpy(&Bits, &Value, sizeof Bits);
   WriteLE<std::uint64_t>(this, Bits);
@@ -592,6 +592,8 @@ void TWriter::WriteChildren(TComponent* Instance) {
   if (Instance != FRoot && Instance->ComponentState().Contains(csInline)) {
     FRoot = Instance;
     FLookupRoot = Instance;
+    // A new nested root has no ancestor: nothing under it is inherited from the outer one.
+    if (!FAncestor) FRootAncestor = nullptr;
   }
   Instance->GetChildren([this](TComponent* C) { WriteChild(C); }, FRoot);
 }

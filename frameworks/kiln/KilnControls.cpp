@@ -386,6 +386,10 @@ void TWinControl::SetTabOrder(int Value) {
     FPendingTabOrder = Value;
     return;
   }
+  if (ComponentState().Contains(csReading) && FParent->ComponentState().Contains(csReading)) {
+    FReadTabOrder = Value;
+    return;
+  }
   int Current = TabOrder();
   if (Current < 0) return;
   auto& L = FParent->FTabList;
@@ -499,6 +503,33 @@ void TWinControl::GetChildren(const TGetChildProc& Proc, TComponent* Root) {
 void TWinControl::SetChildOrder(TComponent* Child, int Order) {
   auto* C = dynamic_cast<TControl*>(Child);
   if (C && C->FParent == this) SetChildZOrder(C, Order);
+}
+
+void TWinControl::ReadState(TReader* Reader) {
+  inherited::ReadState(Reader);
+  FixupTabList();
+}
+
+void TWinControl::FixupTabList() {
+  std::size_t Count = FTabList.size();
+  std::vector<TWinControl*> Placed(Count, nullptr);
+  std::vector<bool> IsPlaced(Count, false);
+  bool Any = false;
+  for (std::size_t I = 0; I < Count; ++I) {
+    int At = std::exchange(FTabList[I]->FReadTabOrder, -1);
+    if (At < 0 || static_cast<std::size_t>(At) >= Count || Placed[static_cast<std::size_t>(At)]) continue;
+    Placed[static_cast<std::size_t>(At)] = FTabList[I];
+    IsPlaced[I] = Any = true;
+  }
+  if (!Any) return;
+  std::size_t Gap = 0;
+  for (std::size_t I = 0; I < Count; ++I) {
+    if (IsPlaced[I]) continue;
+    while (Placed[Gap]) ++Gap;
+    Placed[Gap] = FTabList[I];
+  }
+  FTabList = std::move(Placed);
+  FTabListStale = true;
 }
 
 void TWinControl::Loaded() {

@@ -292,6 +292,9 @@ class FK_API TWinControl : public TControl {
   void GetChildren(const TGetChildProc& Proc, TComponent* Root) override;
   void SetChildOrder(TComponent* Child, int Order) override;
   void Loaded() override;
+  /// Reads the properties and children, then puts the children read into the tab order
+  /// their stream gave: each position is only meaningful once all siblings are there.
+  void ReadState(TReader* Reader) override;
 
 protected:
   /// A child joined (`Inserting`) or left; the default re-aligns.
@@ -318,6 +321,10 @@ private:
   /// True while some member's `FTabIndex` may be stale.
   mutable bool FTabListStale = false;
   int FPendingTabOrder = -1;
+  /// The tab position a stream gave while the parent was still reading its children.
+  int FReadTabOrder = -1;
+  /// Places the children that have a read tab position there, the others in the gaps.
+  void FixupTabList();
   int FAlignLevel = 0;
   bool FAligning = false;
   bool FTabStop = false;

@@ -9,6 +9,8 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+#include <limits>
 #include <map>
 
 using namespace formkit;
@@ -174,4 +176,99 @@ TEST(ReaderSafety, AnInheritedComponentMovedToAnotherParentStaysInheritedAndReop
   TObjectGuard<TComponent> Again(ReadBytes(Bytes, ReadBytes(AncestorBytes)));
   EXPECT_EQ(Again.Get(), Ctl(Again.Get(), "Button2")->FParent);
   EXPECT_EQ(Bytes, WriteBytes(Again.Get(), Ancestor.Get()));
+}
+
+TEST(ReaderSafety, ANewNestedRootInADescendantInheritsNothingFromTheOuterAncestor) {
+  TObjectGuard<TTestForm> Ancestor(BuildRichForm()); // has Button1 under Panel1
+  std::vector<std::uint8_t> AncestorBytes = WriteBytes(Ancestor.Get());
+  TObjectGuard<TComponent> Form(ReadBytes(TextToBinary("inherited Form1: TTestForm\n"
+                                                       "  inline Frame2: TOtherForm\n"
+                                                       "    object Button1: TTestControl\n"
+                                                       "    end\n"
+                                                       "  end\n"
+                                                       "end\n"),
+                                          ReadBytes(AncestorBytes)));
+  std::vector<std::uint8_t> Bytes = WriteBytes(Form.Get(), Ancestor.Get());
+  EXPECT_NE(String::npos, BinaryToText(Bytes).find("    object Button1: TTestControl"));
+  TObjectGuard<TComponent> Again(ReadBytes(Bytes, ReadBytes(AncestorBytes)));
+  EXPECT_EQ(Bytes, WriteBytes(Again.Get(), Ancestor.Get()));
+}
+
+//===----------------------------------------------------------------------===//
+// Values and names that would not read back
+//===----------------------------------------------------------------------===//
+
+TEST(ReaderSafety, ACharacterAbove127ReadsWritesAndReadsBack) {
+  TObjectGuard<TComponent> Form(ReadBytes(TextToBinary("object Form1: TTestForm\n  Letter = 212\nend\n")));
+  auto* Root = static_cast<TTestForm*>(Form.Get());
+  EXPECT_EQ(212, static_cast<unsigned char>(Root->Letter));
+  EXPECT_EQ(212, GetOrdProp(Root, Root->ClassType()->FindProperty("Letter")));
+  TObjectGuard<TComponent> Again(ReadBytes(WriteBytes(Root)));
+  EXPECT_EQ(Root->Letter, static_cast<TTestForm*>(Again.Get())->Letter);
+}
+
+TEST(ReaderSafety, ANumberNoFormFileCanHoldIsRefusedBothWays) {
+  // Ratio read as not-a-number: an invalid value, whatever the bits.
+  std::vector<std::uint8_t> Bytes = {'K', 'D', 'S', '1', 0xF0, 9, 'T', 'T', 'e', 's', 't', 'F', 'o', 'r', 'm', 5,
+                                     'F', 'o', 'r', 'm', '1', 5, 'R', 'a', 't', 'i', 'o', vaDouble,
+                                     0, 0, 0, 0, 0, 0, 0xF8, 0x7F, 0, 0};
+  try {
+    TObjectGuard<TComponent> Form(ReadBytes(Bytes));
+    FAIL() << "a NaN was read";
+  } catch (const EReadError& E) {
+    EXPECT_STREQ("Error reading Form1.Ratio: Invalid property value", E.what());
+  }
+  // A number too large for a narrower property is refused too, and the value stays.
+  std::vector<std::uint8_t> Large = {'K', 'D', 'S', '1', 0xF0, 9, 'T', 'T', 'e', 's', 't', 'F', 'o', 'r', 'm', 5,
+                                     'F', 'o', 'r', 'm', '1', 5, 'S', 'c', 'a', 'l', 'e', vaDouble};
+  double Huge = 1e300;
+  std::uint8_t Bits[8];
+  std::memcpy(Bits, &Huge, 8);
+  Large.insert(Large.end(), Bits, Bits + 8);
+  Large.insert(Large.end(), {0, 0});
+  TObjectGuard<TComponent> Target(CreateComponent(TTestForm::StaticClass(), nullptr));
+  static_cast<TTestForm*>(Target.Get())->Scale = 0.5f;
+  EXPECT_THROW(ReadBytes(Large, Target.Get()), EReadError);
+  EXPECT_EQ(0.5f, static_cast<TTestForm*>(Target.Get())->Scale);
+  // Set by a program, it is not written: the save fails instead of writing what would not reopen.
+  TObjectGuard<TTestForm> Form(static_cast<TTestForm*>(CreateComponent(TTestForm::StaticClass(), nullptr)));
+  Form->Ratio = std::numeric_limits<double>::infinity();
+  try {
+    WriteBytes(Form.Get());
+    FAIL() << "an infinity was written";
+  } catch (const EWriteError& E) {
+    EXPECT_STREQ("Invalid floating point value to write", E.what());
+  }
+}
+
+TEST(ReaderSafety, AComponentMayNotBearItsOwnersNameNorTheOwnerOneOfItsComponents) {
+  TObjectGuard<TTestForm> Form(static_cast<TTestForm*>(CreateComponent(TTestForm::StaticClass(), nullptr)));
+  Form->SetName("Form1");
+  TTestControl* Button = AddControl(Form.Get(), Form.Get(), "Button1");
+  try {
+    Button->SetName("FORM1");
+    FAIL();
+  } catch (const EComponentError& E) {
+    EXPECT_STREQ("A component named FORM1 already exists", E.what());
+  }
+  try {
+    Form->SetName("button1");
+    FAIL();
+  } catch (const EComponentError& E) {
+    EXPECT_STREQ("A component named button1 already exists", E.what());
+  }
+  EXPECT_EQ("Button1", Button->Name());
+  EXPECT_EQ("Form1", Form->Name());
+  // Pasted under that name, the component is refused, so a reference to the form stays one.
+  std::vector<std::uint8_t> Pasted = TextToBinary("object ForM1: TTestControl\nend\n");
+  Pasted.push_back(vaNull); // the end of the list of components
+  TObjectGuard<TBytesStream> In(new TBytesStream(Pasted));
+  TObjectGuard<TReader> R(new TReader(In.Get(), 1024));
+  try {
+    R->ReadComponents(Form.Get(), Form.Get(), nullptr);
+    FAIL() << "a component took its owner's name";
+  } catch (const EReadError& E) {
+    EXPECT_STREQ("A component named ForM1 already exists", E.what());
+  }
+  EXPECT_EQ(1, Form->ComponentCount());
 }

@@ -144,3 +144,31 @@ TEST_F(KilnAtScale, ALabelsFocusControlStreamsByNameAndClearsWhenItGoes) {
   Other.P = nullptr;
   EXPECT_EQ(nullptr, Label->FocusControl());
 }
+
+TEST_F(KilnAtScale, TabPositionsReadApplyOnceAllSiblingsAreThere) {
+  // Written in this order, the tab order is Edit2, Edit1, Button1: each position only makes
+  // sense among all three, so it cannot be applied as each child arrives.
+  const String Text = "object Form1: TForm\n"
+                      "  object Button1: TButton\n"
+                      "    TabOrder = 2\n"
+                      "  end\n"
+                      "  object Edit1: TEdit\n"
+                      "    TabOrder = 1\n"
+                      "  end\n"
+                      "  object Edit2: TEdit\n"
+                      "    TabOrder = 0\n"
+                      "  end\n"
+                      "end\n";
+  TObjectGuard<TBytesStream> In(new TBytesStream(Text.data(), Text.size()));
+  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
+  ObjectTextToBinary(In.Get(), Bin.Get());
+  std::vector<std::uint8_t> Bytes(Bin->Memory(), Bin->Memory() + Bin->Size());
+  TRootGuard<TForm> Form(Open<TForm>(Bytes));
+  EXPECT_EQ(2, static_cast<TWinControl*>(Form->FindComponent("Button1"))->TabOrder());
+  EXPECT_EQ(1, static_cast<TWinControl*>(Form->FindComponent("Edit1"))->TabOrder());
+  EXPECT_EQ(0, static_cast<TWinControl*>(Form->FindComponent("Edit2"))->TabOrder());
+  // Saved and reopened, the order stays.
+  std::vector<std::uint8_t> Saved = Save(Form.P);
+  TRootGuard<TForm> Again(Open<TForm>(Saved));
+  EXPECT_EQ(Saved, Save(Again.P));
+}
