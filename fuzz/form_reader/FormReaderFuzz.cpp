@@ -1,96 +1,80 @@
 //===- fuzz/form_reader/FormReaderFuzz.cpp - Fuzzing the form reader ------===//
 //
-// Feeds each input to every reader of form data: a root read, the binary to text
-// conversion and the text to binary conversion. Bad input must end in
-// `EReadError`; anything else (a crash, a leak, another exception) is a finding.
-// Whatever reads successfully must also convert back exactly.
+// Feeds each input to every reader of form data, over the streaming test
+// family (controls with every kind of property, a collection whose items hold
+// references, a sub-object, a defined binary property):
+//
+//   - the conversions, binary to text and text to binary, with and without a
+//     resource header: what converts must convert back exactly;
+//   - a root read into a form, and a root created from the class the data names;
+//   - a read that an `OnError` handler carries on past every error, so that the
+//     reader skips the property or component at fault and reads the rest;
+//   - a read over a form that already holds the components of an ancestor, as
+//     a descendant is read;
+//   - `ReadComponents` into a live form, as a paste is.
+//
+// Bad input must end in `EReadError`; anything else (a crash, a leak, another
+// exception, a failed check) is a finding. Whatever reads successfully is
+// written, read back and written again to the same bytes, and freed.
 //
 // Example:
 //   build/test/fuzz/form_reader/fk_fuzz_form_reader -runs=20000 scratch/ corpus/
 //
 //===----------------------------------------------------------------------===//
+#include "fuzz/support/StreamChecks.h"
 #include "tests/platform/StreamingFixtures.h"
 
-#include <cstdlib>
-#include <cstring>
-
 using namespace formkit;
+using namespace formkit::fuzzing;
 using namespace formkit::streamtest;
 
 namespace {
 
-void Require(bool Condition) {
-  if (!Condition) std::abort();
+/// An empty form of the test family.
+TComponent* NewTestForm() { return CreateComponent(TTestForm::StaticClass(), nullptr); }
+
+/// The rich form, as data: the ancestor of descendant reads and the host of pastes.
+const TBytes& RichData() {
+  static const TBytes Data = [] {
+    TObjectGuard<TTestForm> Form(BuildRichForm());
+    return WriteRoot(Form.Get());
+  }();
+  return Data;
 }
 
-std::vector<std::uint8_t> Bytes(TMemoryStream* S) { return BytesOf(S); }
-
-/// A root read; what was read writes and reads again.
-void ReadAsRoot(const std::uint8_t* Data, std::size_t Size) {
-  TObjectGuard<TBytesStream> In(new TBytesStream(Data, Size));
-  if (TestStreamFormat(In.Get()) == sofBinary && Size > 0 && Data[0] == 0xFF) {
-    try {
-      In->ReadResHeader();
-    } catch (const EReadError&) {
-      return;
-    }
-  }
-  TObjectGuard<TReader> R(new TReader(In.Get(), 256));
-  TObjectGuard<TComponent> Root(CreateComponent(TTestForm::StaticClass(), nullptr));
-  try {
-    R->ReadRootComponent(Root.Get());
-  } catch (const EReadError&) {
-    return;
-  }
-  std::vector<std::uint8_t> Written = WriteBytes(Root.Get());
-  TObjectGuard<TComponent> Again(ReadBytes(Written));
-  Require(WriteBytes(Again.Get()) == Written);
+/// A live rich form that descendants are written against; never changed.
+TComponent* RichAncestor() {
+  static TComponent* const Ancestor = ReadRoot(RichData(), NewTestForm);
+  return Ancestor;
 }
 
-/// Binary to text; the text converts back to data that gives the same text.
-void BinaryToTextAndBack(const std::uint8_t* Data, std::size_t Size) {
-  TObjectGuard<TBytesStream> In(new TBytesStream(Data, Size));
-  TObjectGuard<TMemoryStream> Text(new TMemoryStream);
-  try {
-    ObjectBinaryToText(In.Get(), Text.Get());
-  } catch (const EReadError&) {
-    return;
-  }
-  Text->SetPosition(0);
-  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
-  ObjectTextToBinary(Text.Get(), Bin.Get());
-  Bin->SetPosition(0);
-  TObjectGuard<TMemoryStream> Text2(new TMemoryStream);
-  ObjectBinaryToText(Bin.Get(), Text2.Get());
-  Require(Bytes(Text.Get()) == Bytes(Text2.Get()));
-}
-
-/// Text to binary; the data converts to text that gives the same data.
-void TextToBinaryAndBack(const std::uint8_t* Data, std::size_t Size) {
-  TObjectGuard<TBytesStream> In(new TBytesStream(Data, Size));
-  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
-  try {
-    ObjectTextToBinary(In.Get(), Bin.Get());
-  } catch (const EReadError&) {
-    Require(In->Position() == 0 && Bin->Size() == 0);
-    return;
-  }
-  Bin->SetPosition(0);
-  TObjectGuard<TMemoryStream> Text(new TMemoryStream);
-  ObjectBinaryToText(Bin.Get(), Text.Get());
-  Text->SetPosition(0);
-  TObjectGuard<TMemoryStream> Bin2(new TMemoryStream);
-  ObjectTextToBinary(Text.Get(), Bin2.Get());
-  Require(Bytes(Bin.Get()) == Bytes(Bin2.Get()));
-}
+/// A new rich form, read from its data.
+TComponent* NewRichForm() { return ReadRoot(RichData(), NewTestForm); }
 
 } // namespace
 
+extern "C" int LLVMFuzzerInitialize(int*, char***) {
+  RegisterStreamingClasses();
+  RichAncestor();
+  return 0;
+}
+
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* Data, std::size_t Size) {
-  static const bool Registered = (RegisterStreamingClasses(), true);
-  (void)Registered;
-  ReadAsRoot(Data, Size);
-  BinaryToTextAndBack(Data, Size);
-  TextToBinaryAndBack(Data, Size);
+  CheckConversions(Data, Size);
+  TBytes Stream;
+  if (!ComponentData(Data, Size, Stream)) return 0;
+  std::uint32_t Variant = InputHash(Data, Size);
+  bool Skip = Variant & 1;
+
+  CheckRootRead(Stream, NewTestForm, false);
+  CheckRootRead(Stream, nullptr, true);
+  CheckRootRead(Stream, NewRichForm, Skip, RichAncestor());
+  TBytes List;
+  if (ComponentListData(Data, Size, List)) {
+    // Pasted into a rich form, at the top or under its panel.
+    TObjectGuard<TComponent> Host(NewRichForm());
+    TComponent* Parent = Variant & 2 ? Host->FindComponent("Panel1") : Host.Get();
+    CheckPaste(List, Host.Get(), Parent, Skip, NewTestForm);
+  }
   return 0;
 }

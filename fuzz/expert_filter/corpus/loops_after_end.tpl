@@ -1,0 +1,7 @@
+[!foreach(deep)]
+[!endforeach][!foreach(deep)]
+[!endforeach][!foreach(deep)]
+[!endforeach][!foreach(deep)]
+[!endforeach]
+[!foreach(none)][!endforeach][!foreach(items)]
+[!items.name][!endforeach][!endforeach]

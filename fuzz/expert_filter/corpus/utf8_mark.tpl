@@ -1,0 +1,4 @@
+﻿unit [!Name];
+[!foreach(i in items)]
+  [!i.name] = [!i.x];
+[!endforeach]
