@@ -206,15 +206,8 @@ namespace detail {
 namespace {
 TComponent* const Tombstone = reinterpret_cast<TComponent*>(std::uintptr_t(1));
 
-/// FNV-1a over the name folded to ASCII upper case, so the hash agrees with CompareText.
 std::uint64_t NameHash(std::string_view Name) noexcept {
-  std::uint64_t H = 14695981039346656037ull;
-  for (char C : Name) {
-    unsigned char U = static_cast<unsigned char>(C);
-    if (U >= 'a' && U <= 'z') U -= 32;
-    H = (H ^ U) * 1099511628211ull;
-  }
-  return H | 1; // never 0, so a zero hash marks nothing
+  return FoldedNameHash(Name) | 1; // never 0, so a zero hash marks nothing
 }
 } // namespace
 

@@ -46,18 +46,6 @@ void TClassRec::FinishProperties() {
   IndexPropertiesByName();
 }
 
-namespace {
-/// FNV-1a over the name folded to ASCII upper case, so that it agrees with `SameText`.
-std::uint64_t FoldedNameHash(std::string_view Name) noexcept {
-  std::uint64_t H = 14695981039346656037ull;
-  for (char C : Name) {
-    unsigned char U = static_cast<unsigned char>(C);
-    if (U >= 'a' && U <= 'z') U -= 32;
-    H = (H ^ U) * 1099511628211ull;
-  }
-  return H;
-}
-} // namespace
 
 void TClassRec::IndexPropertiesByName() {
   std::size_t Size = 8;

@@ -349,6 +349,12 @@ bool SameText(std::string_view A, std::string_view B) noexcept {
   return A.size() == B.size() && (A == B || CompareText(A, B) == 0);
 }
 
+std::uint64_t FoldedNameHash(std::string_view Name) noexcept {
+  std::uint64_t H = 14695981039346656037ull;
+  for (char C : Name) H = (H ^ FoldAscii(static_cast<unsigned char>(C))) * 1099511628211ull;
+  return H;
+}
+
 String UpperCase(std::string_view S) {
   String R(S);
   for (char& C : R) C = static_cast<char>(FoldAscii(static_cast<unsigned char>(C)));

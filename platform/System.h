@@ -106,6 +106,9 @@ template <class... A> String Format(std::string_view Fmt, const A&... Args) {
 FK_API int CompareText(std::string_view A, std::string_view B) noexcept;
 /// True when `CompareText` is 0.
 FK_API bool SameText(std::string_view A, std::string_view B) noexcept;
+/// A hash of a name that agrees with `SameText`: FNV-1a over the name folded to ASCII upper
+/// case. For tables of names looked up without regard to case.
+FK_API std::uint64_t FoldedNameHash(std::string_view Name) noexcept;
 /// ASCII upper and lower case; other bytes unchanged.
 FK_API String UpperCase(std::string_view S);
 FK_API String LowerCase(std::string_view S);

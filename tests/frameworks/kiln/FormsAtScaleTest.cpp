@@ -30,6 +30,13 @@ template <class T> T* Open(const std::vector<std::uint8_t>& Bytes) {
   return static_cast<T*>(R->ReadRootComponent(CreateComponentOf<T>(nullptr)));
 }
 
+std::vector<std::uint8_t> FromText(const String& Text) {
+  TObjectGuard<TBytesStream> In(new TBytesStream(Text.data(), Text.size()));
+  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
+  ObjectTextToBinary(In.Get(), Bin.Get());
+  return std::vector<std::uint8_t>(Bin->Memory(), Bin->Memory() + Bin->Size());
+}
+
 std::vector<std::uint8_t> ThroughText(const std::vector<std::uint8_t>& Bytes) {
   TObjectGuard<TBytesStream> In(new TBytesStream(Bytes));
   TObjectGuard<TMemoryStream> Text(new TMemoryStream);
@@ -92,10 +99,7 @@ TEST_F(KilnAtScale, AFailedReadInsideANewContainerKeepsTheAdoptedControl) {
                       "    end\n"
                       "  end\n"
                       "end\n";
-  TObjectGuard<TBytesStream> In(new TBytesStream(Text.data(), Text.size()));
-  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
-  ObjectTextToBinary(In.Get(), Bin.Get());
-  Bin->SetPosition(0);
+  TObjectGuard<TBytesStream> Bin(new TBytesStream(FromText(Text)));
   TObjectGuard<TReader> R(new TReader(Bin.Get(), 4096));
   try {
     R->ReadRootComponent(Form.P);
@@ -159,11 +163,7 @@ TEST_F(KilnAtScale, TabPositionsReadApplyOnceAllSiblingsAreThere) {
                       "    TabOrder = 0\n"
                       "  end\n"
                       "end\n";
-  TObjectGuard<TBytesStream> In(new TBytesStream(Text.data(), Text.size()));
-  TObjectGuard<TMemoryStream> Bin(new TMemoryStream);
-  ObjectTextToBinary(In.Get(), Bin.Get());
-  std::vector<std::uint8_t> Bytes(Bin->Memory(), Bin->Memory() + Bin->Size());
-  TRootGuard<TForm> Form(Open<TForm>(Bytes));
+  TRootGuard<TForm> Form(Open<TForm>(FromText(Text)));
   EXPECT_EQ(2, static_cast<TWinControl*>(Form->FindComponent("Button1"))->TabOrder());
   EXPECT_EQ(1, static_cast<TWinControl*>(Form->FindComponent("Edit1"))->TabOrder());
   EXPECT_EQ(0, static_cast<TWinControl*>(Form->FindComponent("Edit2"))->TabOrder());
