@@ -5,10 +5,11 @@
 // from binary and from text, saving to both, and freeing the form through its
 // own teardown. Each figure carries `x_base`, its time over a baseline measured
 // in the same run on the same data: the reader's own skip walk of the same
-// stream for loading and saving, plain `new`/`delete` of as many objects for
-// freeing. Two failure paths are measured too: dropping what a read created
-// when it fails after N siblings, and reading and freeing N references into a
-// module that is not open. From N to 10N the times should grow about 10x.
+// stream for loading and saving, plain `new`/`delete` of as many blocks of the
+// same sizes for freeing. Two failure paths are measured too: dropping what a
+// read created when it fails after N siblings, and reading and freeing N
+// references into a module that is not open. From N to 10N the times should
+// grow about 10x.
 //
 // Example:
 //   build/release/bench/kiln/fk_bench_kiln_forms --benchmark_min_time=0.2
@@ -102,15 +103,18 @@ void SkipWalk(const std::vector<std::uint8_t>& Bytes) {
   R->SkipComponent(true);
 }
 
-/// Plain objects of about a control's size, made and freed: the floor of a teardown.
-struct TPlainObject {
-  char Payload[256];
-};
+/// Plain objects as many and as large as a form's: for each control, one block of a
+/// button's size and one of its font's, made and freed from the last to the first. The
+/// floor of a teardown, touching as much memory.
 void PlainNewDelete(int Count) {
-  std::vector<TPlainObject*> Objects(static_cast<std::size_t>(Count));
-  for (auto& O : Objects) O = new TPlainObject;
-  benchmark::DoNotOptimize(Objects.data());
-  for (std::size_t I = Objects.size(); I-- > 0;) delete Objects[I];
+  std::vector<char*> Blocks;
+  Blocks.reserve(static_cast<std::size_t>(Count) * 2);
+  for (int I = 0; I < Count; ++I) {
+    Blocks.push_back(new char[sizeof(TButton)]);
+    Blocks.push_back(new char[sizeof(TFont)]);
+  }
+  benchmark::DoNotOptimize(Blocks.data());
+  for (std::size_t I = Blocks.size(); I-- > 0;) delete[] Blocks[I];
 }
 
 /// Runs `Step` (which times itself and returns seconds) and reports `x_base` against
