@@ -221,11 +221,11 @@ TEST(ReaderSafety, ANumberNoFormFileCanHoldIsRefusedBothWays) {
   // A number too large for a narrower property is refused too, and the value stays.
   std::vector<std::uint8_t> Large = {'K', 'D', 'S', '1', 0xF0, 9, 'T', 'T', 'e', 's', 't', 'F', 'o', 'r', 'm', 5,
                                      'F', 'o', 'r', 'm', '1', 5, 'S', 'c', 'a', 'l', 'e', vaDouble};
+  // The double's eight bytes, then the ends of the property list and of the children.
+  std::size_t At = Large.size();
+  Large.resize(At + 8 + 2, 0);
   double Huge = 1e300;
-  std::uint8_t Bits[8];
-  std::memcpy(Bits, &Huge, 8);
-  Large.insert(Large.end(), Bits, Bits + 8);
-  Large.insert(Large.end(), {0, 0});
+  std::memcpy(Large.data() + At, &Huge, sizeof Huge);
   TObjectGuard<TComponent> Target(CreateComponent(TTestForm::StaticClass(), nullptr));
   static_cast<TTestForm*>(Target.Get())->Scale = 0.5f;
   EXPECT_THROW(ReadBytes(Large, Target.Get()), EReadError);
