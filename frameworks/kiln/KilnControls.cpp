@@ -11,6 +11,7 @@ namespace formkit {
 FK_RESOURCESTRING(SControlParentSelf, "Control '%s' cannot be its own parent");
 FK_RESOURCESTRING(SControlParentChild, "Control '%s' cannot be parented to '%s', which lies inside it");
 FK_RESOURCESTRING(SControlNotWindowed, "Control '%s' cannot hold '%s': only a windowed control holds children");
+FK_RESOURCESTRING(SComponentHoldsNoControls, "Component '%s' cannot hold the control '%s'");
 FK_RESOURCESTRING(SControlNotChild, "Control '%s' is not a child of '%s'");
 FK_RESOURCESTRING(SControlNotParent, "'%s' is not a parent of control '%s'");
 FK_RESOURCESTRING(SControlIndexError, "Control index out of bounds (%d)");
@@ -241,9 +242,12 @@ void TControl::SetParentComponent(TComponent* AParent) {
     return;
   }
   // A control read under a non-visual root stays without a parent; under another kind
-  // of control it cannot stand.
+  // of control, or under a non-visual component of a module, it cannot stand: it would
+  // be written back somewhere else.
   if (dynamic_cast<TControl*>(AParent))
     throw EInvalidOperation(SControlNotWindowed, DisplayName(AParent), DisplayName(this));
+  if (AParent && AParent->Owner())
+    throw EInvalidOperation(SComponentHoldsNoControls, DisplayName(AParent), DisplayName(this));
   SetParent(nullptr);
 }
 

@@ -172,3 +172,25 @@ TEST_F(KilnAtScale, TabPositionsReadApplyOnceAllSiblingsAreThere) {
   TRootGuard<TForm> Again(Open<TForm>(Saved));
   EXPECT_EQ(Saved, Save(Again.P));
 }
+
+TEST_F(KilnAtScale, AControlReadUnderANonVisualComponentIsRefusedAndKeepsItsParent) {
+  TRootGuard<TForm> Form(CreateComponentOf<TForm>(nullptr));
+  Form->SetName("Form1");
+  auto* Edit = Make<TEdit>(Form.P, Form.P, "Edit1");
+  Make<TTimer>(Form.P, nullptr, "Timer1");
+  // Edit1 would be left without a parent, and written back under the form.
+  TObjectGuard<TBytesStream> Bin(new TBytesStream(FromText("object Form1: TForm\n"
+                                                           "  inherited Timer1: TTimer\n"
+                                                           "    inherited Edit1: TEdit\n"
+                                                           "    end\n"
+                                                           "  end\n"
+                                                           "end\n")));
+  TObjectGuard<TReader> R(new TReader(Bin.Get(), 4096));
+  try {
+    R->ReadRootComponent(Form.P);
+    FAIL() << "a control stood under a timer";
+  } catch (const EReadError& E) {
+    EXPECT_STREQ("Component 'Timer1' cannot hold the control 'Edit1'", E.what());
+  }
+  EXPECT_EQ(Form.P, Edit->Parent());
+}
