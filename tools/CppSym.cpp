@@ -11,13 +11,8 @@ TSymbolTable* CppSymbols = nullptr;
 
 namespace {
 
-struct TWordEntry {
-  std::uint8_t Token;
-  std::string_view Word;
-};
-
 // In table order: the order of insertion decides the order within a bucket.
-constexpr TWordEntry CppWords[] = {
+constexpr detail::TReservedWord CppWords[] = {
     {4, "alignas"}, {4, "alignof"}, {4, "__array_rank"}, {4, "__array_extent"}, {4, "__asm"},
     {4, "_asm"}, {4, "asm"}, {4, "auto"}, {11, "__automated"}, {4, "axiom"}, {4, "_Bool"},
     {4, "bool"}, {4, "break"}, {4, "case"}, {4, "catch"}, {4, "__cdecl"}, {4, "_cdecl"},
@@ -68,14 +63,7 @@ std::size_t MaxCppSymLength = 0;
 
 void InitializeCppSym() {
   if (CppSymbols) return;
-  TObjectGuard<TSymbolTable> Table(new TSymbolTable(stCaseSensitive)); // frees what was built if one fails
-  std::size_t MaxLength = 0;
-  for (const TWordEntry& E : CppWords) {
-    Table->Insert(new TCppSymbol(detail::ShortString(E.Word), E.Token));
-    if (E.Word.size() > MaxLength) MaxLength = E.Word.size();
-  }
-  MaxCppSymLength = MaxLength;
-  CppSymbols = Table.Release();
+  CppSymbols = detail::BuildReservedWords<TCppSymbol>(CppWords, stCaseSensitive, MaxCppSymLength);
 }
 
 void FinalizeCppSym() noexcept {
@@ -84,15 +72,8 @@ void FinalizeCppSym() noexcept {
 }
 
 namespace {
-/// The unit's load and unload: a program that links the unit has the table from its
-/// start to its end, before anything asks for a word.
-struct TCppSymUnit {
-  TCppSymUnit() { InitializeCppSym(); }
-  ~TCppSymUnit() { FinalizeCppSym(); }
-  TCppSymUnit(const TCppSymUnit&) = delete;
-  TCppSymUnit& operator=(const TCppSymUnit&) = delete;
-};
-const TCppSymUnit CppSymUnit;
+/// The table exists from the start of a program that links this unit, before anything asks.
+const detail::TUnitLifetime<InitializeCppSym, FinalizeCppSym> CppSymUnit;
 } // namespace
 
 namespace CppSym {

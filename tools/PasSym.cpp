@@ -11,13 +11,8 @@ TSymbolTable* PascalSymbols = nullptr;
 
 namespace {
 
-struct TWordEntry {
-  std::uint8_t Token;
-  std::string_view Word;
-};
-
 // In table order: the order of insertion decides the order within a bucket.
-constexpr TWordEntry PascalWords[] = {
+constexpr detail::TReservedWord PascalWords[] = {
     {4, "AND"},          {5, "ARRAY"},           {4, "AS"},          {135, "ASM"},
     {33, "AUTOMATED"},   {20, "BEGIN"},          {27, "CASE"},       {31, "CLASS"},
     {15, "CONST"},       {21, "CONSTRUCTOR"},    {22, "DESTRUCTOR"}, {131, "DISPINTERFACE"},
@@ -45,14 +40,7 @@ std::size_t MaxPasSymLength = 0;
 
 void InitializePasSym() {
   if (PascalSymbols) return;
-  TObjectGuard<TSymbolTable> Table(new TSymbolTable(stInsensitive)); // frees what was built if one fails
-  std::size_t MaxLength = 0;
-  for (const TWordEntry& E : PascalWords) {
-    Table->Insert(new TPascalSymbol(detail::ShortString(E.Word), E.Token));
-    if (E.Word.size() > MaxLength) MaxLength = E.Word.size();
-  }
-  MaxPasSymLength = MaxLength;
-  PascalSymbols = Table.Release();
+  PascalSymbols = detail::BuildReservedWords<TPascalSymbol>(PascalWords, stInsensitive, MaxPasSymLength);
 }
 
 void FinalizePasSym() noexcept {
@@ -61,15 +49,8 @@ void FinalizePasSym() noexcept {
 }
 
 namespace {
-/// The unit's load and unload: a program that links the unit has the table from its
-/// start to its end, before anything asks for a word.
-struct TPasSymUnit {
-  TPasSymUnit() { InitializePasSym(); }
-  ~TPasSymUnit() { FinalizePasSym(); }
-  TPasSymUnit(const TPasSymUnit&) = delete;
-  TPasSymUnit& operator=(const TPasSymUnit&) = delete;
-};
-const TPasSymUnit PasSymUnit;
+/// The table exists from the start of a program that links this unit, before anything asks.
+const detail::TUnitLifetime<InitializePasSym, FinalizePasSym> PasSymUnit;
 } // namespace
 
 namespace PasSym {

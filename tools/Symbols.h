@@ -17,6 +17,7 @@
 
 #include "platform/Objects.h"
 
+#include <algorithm>
 #include <functional>
 #include <vector>
 
@@ -217,5 +218,42 @@ private:
   std::vector<TBaseSymbol*> FList;
   std::int32_t FCount = 0;
 };
+
+//===----------------------------------------------------------------------===//
+// Reserved-word units
+//===----------------------------------------------------------------------===//
+
+namespace detail {
+/// One reserved word of a language and its token.
+struct TReservedWord {
+  std::uint8_t Token;
+  std::string_view Word;
+};
+
+/// A table of `Words` as symbols of `TSym` (made from a name and a token), in their order;
+/// `MaxLength` gets the longest word's length. The table is the caller's; a failure
+/// frees what was built.
+template <class TSym, std::size_t N>
+[[nodiscard]] TSymbolTable* BuildReservedWords(const TReservedWord (&Words)[N], TSymbolTableKind Kind,
+                                               std::size_t& MaxLength) {
+  TObjectGuard<TSymbolTable> Table(new TSymbolTable(Kind));
+  std::size_t Longest = 0;
+  for (const TReservedWord& E : Words) {
+    Table->Insert(new TSym(ShortString(E.Word), E.Token));
+    Longest = std::max(Longest, E.Word.size());
+  }
+  MaxLength = Longest;
+  return Table.Release();
+}
+
+/// A unit's load and unload: an object of this type at namespace scope in the unit's
+/// file starts it when the program that links the file starts, and stops it at the end.
+template <void (*Start)(), void (*Stop)() noexcept> struct TUnitLifetime {
+  TUnitLifetime() { Start(); }
+  ~TUnitLifetime() { Stop(); }
+  TUnitLifetime(const TUnitLifetime&) = delete;
+  TUnitLifetime& operator=(const TUnitLifetime&) = delete;
+};
+} // namespace detail
 
 } // namespace formkit
