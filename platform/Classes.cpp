@@ -61,7 +61,7 @@ namespace {
 } // namespace
 
 FK_IMPLEMENT(TComponent, "Classes") {
-  B.Property("Name", &TComponent::Name, &TComponent::SetName).Stored(false);
+  B.Property("Name", &TComponent::Name, &TComponent::SetName).Type(&TypeInfo_TComponentName).Stored(false);
   B.Property("Tag", &TComponent::Tag, &TComponent::SetTag).Default(0);
 }
 

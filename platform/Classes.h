@@ -105,6 +105,8 @@ FK_SET(TComponentState, TComponentStateFlag)
 FK_ENUM(TComponentStyleFlag, std::uint8_t, csInheritable, csCheckPropAvail, csSubComponent,
         csTransient)
 FK_SET(TComponentStyle, TComponentStyleFlag)
+/// The type record of a component's `Name`, so that its editor can be registered alone.
+FK_ALIAS(TComponentName, tkUString)
 
 /// What a root gives to whoever asks `FindRootDesigner`: told of changes to its objects.
 struct FK_API IDesignerNotify : IInterface {

@@ -435,6 +435,10 @@ FK_API TStreamOriginalFormat TestStreamFormat(TStream* Stream);
 /// `Owner1` and `Owner2`.
 FK_API bool CollectionsEqual(TCollection* C1, TCollection* C2, TComponent* Owner1, TComponent* Owner2);
 
+/// Whether a value may be compared with `Ancestor`: there is one, there is a root
+/// ancestor, and `Root` is of the root ancestor's class or descends from it.
+FK_API bool AncestorIsValid(TPersistent* Ancestor, TComponent* Root, TComponent* RootAncestor);
+
 /// Supplies what a value is compared with: the ancestor object and the roots.
 using TGetLookupInfoEvent = std::function<void(TPersistent*& Ancestor, TComponent*& Root,
                                                TComponent*& LookupRoot, TComponent*& RootAncestor)>;

@@ -33,7 +33,7 @@ namespace formkit {
 namespace {
 FK_RESOURCESTRING(SLineError, "Line %d: %s");
 FK_RESOURCESTRING(SInvalidIdentifier, "Invalid identifier in stream: '%s'");
-FK_RESOURCESTRING(SInvalidFloat, "Invalid floating point value in stream");
+FK_RESOURCESTRING(SInvalidStreamFloat, "Invalid floating point value in stream");
 FK_RESOURCESTRING(SUnknownValueTag, "Unknown value tag %d");
 FK_RESOURCESTRING(SNestingTooDeep, "Stream nesting too deep");
 FK_RESOURCESTRING(SInvalidLength, "Length %d runs past the end of the stream");
@@ -142,7 +142,7 @@ private:
   }
 
   void Float(double V, const char* Suffix) {
-    if (!std::isfinite(V)) throw EReadError(SInvalidFloat);
+    if (!std::isfinite(V)) throw EReadError(SInvalidStreamFloat);
     char Buf[64];
     auto Res = std::to_chars(Buf, Buf + sizeof Buf, V);
     std::string_view S(Buf, static_cast<std::size_t>(Res.ptr - Buf));

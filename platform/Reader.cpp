@@ -18,7 +18,6 @@ namespace formkit {
 namespace {
 FK_RESOURCESTRING(SReadError, "Stream read error");
 FK_RESOURCESTRING(SInvalidImage, "Invalid stream format");
-FK_RESOURCESTRING(SInvalidPropertyValue, "Invalid property value");
 FK_RESOURCESTRING(SUnknownValueTag, "Unknown value tag %d");
 FK_RESOURCESTRING(SInvalidLength, "Length %d runs past the end of the stream");
 FK_RESOURCESTRING(SNestingTooDeep, "Stream nesting too deep");

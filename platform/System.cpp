@@ -11,7 +11,6 @@
 namespace formkit {
 
 FK_RESOURCESTRING(SInvalidFormat, "Format '%s' invalid or incompatible with argument");
-FK_RESOURCESTRING(SInvalidInteger, "'%s' is not a valid integer value");
 FK_RESOURCESTRING(SDateEncodeError, "Invalid argument to date encode");
 FK_RESOURCESTRING(STimeEncodeError, "Invalid argument to time encode");
 FK_RESOURCESTRING(SOperationAborted, "Operation aborted");

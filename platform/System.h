@@ -126,6 +126,8 @@ FK_API String ExtractFileName(std::string_view FileName);
 FK_API String Trim(std::string_view S);
 /// True when `Name` is a valid identifier: a letter or `_`, then letters, digits, `_`.
 FK_API bool IsValidIdent(std::string_view Name) noexcept;
+/// The message of a text that is no integer.
+FK_RESOURCESTRING(SInvalidInteger, "'%s' is not a valid integer value");
 /// Decimal text of an integer.
 FK_API String IntToStr(long long Value);
 /// Parses a decimal or `$`-prefixed hexadecimal integer; raises `EConvertError`

@@ -10,7 +10,6 @@ FK_RESOURCESTRING(SUnknownProperty, "Unknown property: %s");
 FK_RESOURCESTRING(SInvalidPropertyType, "Invalid property type: %s");
 FK_RESOURCESTRING(SReadOnlyProperty, "Property %s is read-only");
 FK_RESOURCESTRING(SWriteOnlyProperty, "Property %s is write-only");
-FK_RESOURCESTRING(SInvalidPropertyValue, "Invalid property value");
 FK_RESOURCESTRING(SInvalidPropertyElement, "Invalid property element: %s");
 FK_RESOURCESTRING(SMethodTokenCall, "Method %s of a generated class cannot be called");
 FK_RESOURCESTRING(SMethodDoesNotFit, "Method %s does not fit");
@@ -19,7 +18,7 @@ namespace detail {
 
 void RaiseWrongKind(const TPropInfo* Prop) { throw EPropertyConvertError(SInvalidPropertyType, Prop->PropType()->Name); }
 void RaiseReadOnly(const TPropInfo* Prop) { throw EPropertyError(SReadOnlyProperty, Prop->Name); }
-void RaiseWriteOnly(const TPropInfo* Prop) { throw EPropertyError(SWriteOnlyProperty, Prop->Name); }
+void RaiseWriteOnly(const TPropInfo* Prop) { throw EPropWriteOnly(SWriteOnlyProperty, Prop->Name); }
 void RaiseInvalidValue() { throw EPropertyConvertError(SInvalidPropertyValue); }
 
 void RaiseTokenCall(const TMethod& M) {
@@ -234,7 +233,7 @@ int GetPropList(PTypeInfo Info, TTypeKinds Kinds, std::vector<PPropInfo>* List, 
   const auto& Source = Sorted ? Class->SortedProperties() : Class->Properties();
   int Count = 0;
   for (PPropInfo P : Source) {
-    if (!Kinds.Contains(P->Kind())) continue;
+    if (Kinds != tkAny && !Kinds.Contains(P->Kind())) continue; // every kind: no type to resolve
     ++Count;
     if (List) List->push_back(P);
   }

@@ -33,7 +33,7 @@ namespace formkit {
 enum TTypeKind : std::uint8_t {
   tkUnknown, tkInteger, tkChar, tkEnumeration, tkFloat, tkString, tkSet, tkClass, tkMethod,
   tkWChar, tkLString, tkWString, tkVariant, tkArray, tkRecord, tkInterface, tkInt64, tkDynArray,
-  tkUString, tkClassRef, tkPointer, tkProcedure
+  tkUString, tkClassRef, tkPointer, tkProcedure, tkMRecord
 };
 using TTypeKinds = TSet<TTypeKind>;
 
@@ -65,6 +65,8 @@ struct FK_API TTypeData {
   TOrdType OrdType = otSLong;
   std::int64_t MinValue = 0;
   std::int64_t MaxValue = 0;
+  /// Short strings: the declared maximum length.
+  int MaxLength = 255;
   TTypeInfoFn BaseType = nullptr;
   std::vector<String> EnumNames;
   /// Sets: the element type.
@@ -135,6 +137,10 @@ struct FK_API TPropInfo {
 
 FK_EXCEPTION(EPropertyError, Exception);
 FK_EXCEPTION(EPropertyConvertError, Exception);
+/// The message of a value a property cannot take.
+FK_RESOURCESTRING(SInvalidPropertyValue, "Invalid property value");
+/// Raised by a read of a property that has no read accessor.
+FK_EXCEPTION(EPropWriteOnly, EPropertyError);
 
 //===----------------------------------------------------------------------===//
 // Introspection
@@ -379,6 +385,12 @@ template <class I> PTypeInfo InterfaceTypeInfo() { return TypeInfo<IPtr<I>>(); }
         #Name, #__VA_ARGS__, ::formkit::detail::SignatureId<__VA_ARGS__>());                      \
     return Info;                                                                                   \
   }
+
+/// The type records of date and time values (`TDateTime` and its date and time forms), so
+/// that editors can be registered for them.
+FK_ALIAS(TDateTime, tkFloat)
+FK_ALIAS(TDate, tkFloat)
+FK_ALIAS(TTime, tkFloat)
 
 } // namespace formkit
 

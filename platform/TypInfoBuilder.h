@@ -253,14 +253,12 @@ public:
   /// const getter, a setter method, or `nullptr` for none.
   template <class G, class S = std::nullptr_t>
   TPropBuilder Property(const char* Name, G Getter, S Setter = nullptr) {
-    using V = typename detail::AccessorValue<G>::Value;
-    static_assert(detail::SlotOf<V>() != detail::TValueSlot::None, "no property kind for this type");
-    auto Prop = std::make_unique<TPropInfo>();
-    Prop->Name = Name;
-    Prop->TypeFn = &TypeInfo<V>;
-    Prop->Declaring = FRec;
-    Prop->Access = std::make_unique<detail::TPropAccessImpl<T, V, G, S>>(Prop.get(), Getter, Setter);
-    return TPropBuilder(FRec->AddOwnProperty(std::move(Prop)));
+    return AddProperty<typename detail::AccessorValue<G>::Value>(Name, Getter, Setter);
+  }
+  /// A property that can only be written, through `Setter` (a field or a setter method);
+  /// a read raises `EPropWriteOnly`.
+  template <class V, class S> TPropBuilder WriteOnly(const char* Name, S Setter) {
+    return AddProperty<V>(Name, nullptr, Setter);
   }
   /// A property read and written through one field.
   template <class V, class C> TPropBuilder Field(const char* Name, V C::*Member) {
@@ -279,6 +277,16 @@ public:
   }
 
 private:
+  template <class V, class G, class S> TPropBuilder AddProperty(const char* Name, G Getter, S Setter) {
+    static_assert(detail::SlotOf<V>() != detail::TValueSlot::None, "no property kind for this type");
+    auto Prop = std::make_unique<TPropInfo>();
+    Prop->Name = Name;
+    Prop->TypeFn = &TypeInfo<V>;
+    Prop->Declaring = FRec;
+    Prop->Access = std::make_unique<detail::TPropAccessImpl<T, V, G, S>>(Prop.get(), Getter, Setter);
+    return TPropBuilder(FRec->AddOwnProperty(std::move(Prop)));
+  }
+
   TClass FRec;
 };
 

@@ -621,6 +621,10 @@ bool CollectionsEqual(TCollection* C1, TCollection* C2, TComponent* Owner1, TCom
   return S1->Size() == S2->Size() && std::memcmp(S1->Memory(), S2->Memory(), static_cast<std::size_t>(S1->Size())) == 0;
 }
 
+bool AncestorIsValid(TPersistent* Ancestor, TComponent* Root, TComponent* RootAncestor) {
+  return Ancestor && RootAncestor && Root && Root->InheritsFrom(RootAncestor->ClassType());
+}
+
 bool IsDefaultPropertyValue(TObject* Instance, PPropInfo Prop, const TGetLookupInfoEvent& OnGetLookupInfo,
                             TWriter* Writer, const TFindComponentValueEvent& OnFindComponentValue) {
   if (!Instance || !Prop || !Prop->IsReadable()) return true;
