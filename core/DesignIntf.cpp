@@ -209,5 +209,6 @@ FK_IMPLEMENT(TBaseCustomModule, "DesignIntf") {}
 void TBaseCustomModule::Create(TComponent*, const IPtr<IDesigner>&) {}
 FK_IMPLEMENT(TDragTarget, "DesignIntf") {}
 FK_IMPLEMENT(TBaseComponentGuidelines, "DesignIntf") {}
+void TBaseComponentGuidelines::Create(const IPtr<IDesigner>& ADesigner) { FDesigner = ADesigner; }
 
 } // namespace formkit

@@ -223,9 +223,14 @@ protected:
   IPtr<IDesigner> FDesigner;
 };
 
+/// The base of the guides a component offers on a surface; made from a class reference
+/// through the virtual constructor (`NewFromClass`), then initialised for one component.
 class FK_API TBaseComponentGuidelines : public TInterfacedObject {
   FK_CLASS(TBaseComponentGuidelines, TInterfacedObject)
-  explicit TBaseComponentGuidelines(const IPtr<IDesigner>& ADesigner = nullptr) : FDesigner(ADesigner) {}
+  /// The virtual constructor: keeps `ADesigner`, which may be null.
+  virtual void Create(const IPtr<IDesigner>& ADesigner);
+  /// Binds the guides to `AComponent`, whose guides are given in the coordinates of
+  /// `AContainer`. Neither is owned.
   virtual void Initialize(TComponent* AComponent, TComponent* AContainer) = 0;
 
 protected:

@@ -13,8 +13,9 @@ std::vector<TGroupChangeProc>& GroupChangeList() {
 } // namespace
 
 void NotifyGroupChange(TGroupChangeProc Proc) {
-  auto& L = GroupChangeList();
-  if (Proc && std::find(L.begin(), L.end(), Proc) == L.end()) L.push_back(Proc);
+  if (!Proc) return;
+  UnnotifyGroupChange(Proc);
+  GroupChangeList().push_back(Proc); // a repeat moves to the end: it is told first
 }
 
 void UnnotifyGroupChange(TGroupChangeProc Proc) {

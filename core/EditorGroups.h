@@ -18,7 +18,7 @@ namespace formkit {
 /// Told the number of a group whose package goes away.
 using TGroupChangeProc = void (*)(int Group);
 
-/// Subscribes `Proc`; a repeat is ignored.
+/// Subscribes `Proc` at the end of the list; a repeat first leaves its old place.
 FK_API void NotifyGroupChange(TGroupChangeProc Proc);
 /// Unsubscribes `Proc`; nothing when absent.
 FK_API void UnnotifyGroupChange(TGroupChangeProc Proc);
