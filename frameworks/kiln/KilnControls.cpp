@@ -16,6 +16,8 @@ FK_RESOURCESTRING(SControlNotChild, "Control '%s' is not a child of '%s'");
 FK_RESOURCESTRING(SControlNotParent, "'%s' is not a parent of control '%s'");
 FK_RESOURCESTRING(SControlIndexError, "Control index out of bounds (%d)");
 FK_RESOURCESTRING(SInvalidPPI, "%d is not a valid number of pixels per inch");
+FK_RESOURCESTRING(SInvalidMarginWidth, "Margin width %d is not valid: it must be 0 or more");
+FK_RESOURCESTRING(SInvalidPaddingWidth, "Padding width %d is not valid: it must be 0 or more");
 
 std::function<int(const TControl*)> ControlPPIHook;
 
@@ -24,6 +26,12 @@ namespace {
 String DisplayName(const TComponent* C) {
   if (!C) return "(none)";
   return C->Name().empty() ? C->ClassName() : C->Name();
+}
+
+/// Raises `EInvalidOperation` with `Message` for the first negative width of `Widths`.
+void CheckWidths(const TRect& Widths, const TResString& Message) {
+  for (int Width : {Widths.Left, Widths.Top, Widths.Right, Widths.Bottom})
+    if (Width < 0) throw EInvalidOperation(Message, Width);
 }
 } // namespace
 
@@ -176,6 +184,11 @@ void TControl::SetColor(TColor Value) {
   if (FColor == Value) return;
   FColor = Value;
   Perform(CM_COLORCHANGED);
+}
+
+void TControl::SetMargins(TRect Value) {
+  CheckWidths(Value, SInvalidMarginWidth);
+  FMargins = Value;
 }
 
 void TControl::SetParentFont(bool Value) {
@@ -372,6 +385,11 @@ void TWinControl::SetChildZOrder(TControl* Child, int Position) {
   FControls.insert(FControls.begin() + Position, Child);
   // Among aligned children of one kind, ties are broken by this order.
   if (Child->Align() != alNone) Realign();
+}
+
+void TWinControl::SetPadding(TRect Value) {
+  CheckWidths(Value, SInvalidPaddingWidth);
+  FPadding = Value;
 }
 
 int TWinControl::TabOrder() const noexcept {

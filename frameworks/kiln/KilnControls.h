@@ -156,6 +156,12 @@ class FK_API TControl : public TComponent, public TMessageTarget {
   void SetCursor(TCursor Value) { FCursor = Value; }
   TControlStyle ControlStyle() const noexcept { return FControlStyle; }
   void SetControlStyle(TControlStyle Value) noexcept { FControlStyle = Value; }
+  /// The space the control keeps free around itself, as four widths (left, top, right,
+  /// bottom); 3 on each side until set. Not published, and no layout reads it: it places
+  /// the guides of a design surface.
+  TRect Margins() const noexcept { return FMargins; }
+  /// Raises `EInvalidOperation` for a negative width, and then the margins stay.
+  void SetMargins(TRect Value);
   /// The pixels per inch the control is laid out for: the host's `ControlPPIHook` when
   /// it answers, else the control's own value (96 until `ScaleForPPI`).
   int CurrentPPI() const;
@@ -229,6 +235,7 @@ private:
   TObjectGuard<TFont> FFont;
   TControlStyle FControlStyle;
   int FPPI = DefaultPPI;
+  TRect FMargins{3, 3, 3, 3};
 };
 
 //===----------------------------------------------------------------------===//
@@ -286,6 +293,12 @@ class FK_API TWinControl : public TControl {
   bool AlignDisabled() const noexcept { return FAlignLevel > 0; }
   /// The part of the client area that aligned children share; a bevel or border narrows it.
   virtual TRect AlignRect() const { return ClientRect(); }
+  /// The space kept free inside the client area, as four widths (left, top, right,
+  /// bottom); 0 until set. Not published, and no layout reads it: it places the guides
+  /// of a design surface.
+  TRect Padding() const noexcept { return FPadding; }
+  /// Raises `EInvalidOperation` for a negative width, and then the padding stays.
+  void SetPadding(TRect Value);
 
   // Streaming ---------------------------------------------------------------
   /// The children that `Root` owns, in z-order.
@@ -328,6 +341,7 @@ private:
   int FAlignLevel = 0;
   bool FAligning = false;
   bool FTabStop = false;
+  TRect FPadding;
 };
 
 /// A control that paints itself and holds no children (a label, a shape).

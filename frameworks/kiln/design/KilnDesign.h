@@ -3,7 +3,9 @@
 // What puts Kiln forms, frames and data modules on a design surface: the
 // designer of the framework (`TKilnDesigner`, modules in ".kfm" files), its
 // module on design (`TKilnRoot`), the surface that shows a root's controls and
-// non-visual components (`TKilnSurface`), and the items of both.
+// non-visual components (`TKilnSurface`), the items of both, and the guides
+// that controls offer for snapping (`TControlGuidelines` and its descendants,
+// registered as the package loads).
 //
 // Example:
 //   StartDesignCore();
@@ -20,6 +22,7 @@
 #include "core/ComponentDesigner.h"
 #include "core/root/ComponentRoot.h"
 #include "core/root/RootItems.h"
+#include "editors/ComponentGuidelines.h"
 #include "frameworks/kiln/KilnForms.h"
 #include "frameworks/kiln/KilnGraphics.h"
 #include "surface/DragBoxes.h"
@@ -106,10 +109,84 @@ class FK_API TKilnDataModuleModule : public TKilnCustomModule {
   bool ValidateComponentClass(TClass ComponentClass) override;
 };
 
+//===----------------------------------------------------------------------===//
+// Guides of controls
+//===----------------------------------------------------------------------===//
+
+FK_RESOURCESTRING(sKilnGuidelinesWrongClass, "%s serves controls of class %s, not %s");
+
+/// The guides of a control: its edges (indices 0 to 3: left, top, right, bottom, the
+/// right and bottom ones on the last pixel inside) and the outer lines of its margins (4
+/// to 7), measured from the control's origin and given in the container's client
+/// coordinates. On the container itself they are measured from its client area.
+class FK_API TControlGuidelines : public TComponentGuidelines {
+  FK_CLASS(TControlGuidelines, TComponentGuidelines)
+  /// Raises `EInvalidCast` `sKilnGuidelinesWrongClass` for a component that is not a control.
+  void Initialize(TComponent* AComponent, TComponent* AContainer) override;
+  /// Add the position of the control's origin in the container's client area: through the
+  /// parents when the container holds the control, else in the parent's client area.
+  /// Nothing on the container itself.
+  int CalcHorzPos(int APos) override { return APos + Origin().X; }
+  int CalcVertPos(int APos) override { return APos + Origin().Y; }
+  int GetCount() override { return 8; }
+  /// Raises `EListError` for an index out of range.
+  TDesignerGuideType GetDesignerGuideType(int Index) override;
+  /// Raises `EListError` for an index out of range.
+  int GetGuideOffset(int Index) override;
+
+  TControl* Control() const noexcept { return static_cast<TControl*>(FComponent); }
+  /// Where the client area starts inside the bounds on the container itself; (0, 0) on
+  /// any other control.
+  TPoint ClientDelta() const noexcept { return FClientDelta; }
+
+protected:
+  /// Raises `EInvalidCast` `sKilnGuidelinesWrongClass` unless `AComponent` is a `Class`.
+  void RequireClass(TComponent* AComponent, TClass Class) const;
+  /// `Offset`, measured from the bounds, less the client delta on the axis of `Type`.
+  int FromClientDelta(TDesignerGuideType Type, int Offset) const noexcept;
+  /// The control's origin in the container's client area.
+  TPoint Origin() const;
+
+  TPoint FClientDelta;
+};
+
+/// The guides of a windowed control. One that accepts child controls, and a frame, adds
+/// the lines its padding draws inside its client area (8 to 11: left, top, right,
+/// bottom), where the margins of its children stop.
+class FK_API TWinControlGuidelines : public TControlGuidelines {
+  FK_CLASS(TWinControlGuidelines, TControlGuidelines)
+  /// Raises `EInvalidCast` `sKilnGuidelinesWrongClass` for a component that is not a
+  /// windowed control.
+  void Initialize(TComponent* AComponent, TComponent* AContainer) override;
+  /// 12 with the padding guides, else 8.
+  int GetCount() override;
+  TDesignerGuideType GetDesignerGuideType(int Index) override;
+  int GetGuideOffset(int Index) override;
+
+  TWinControl* WinControl() const noexcept { return static_cast<TWinControl*>(FComponent); }
+
+protected:
+  bool HasPaddingGuides() const;
+  /// The padding the guides are drawn by: the control's own.
+  virtual TRect GuidePadding() const { return WinControl()->Padding(); }
+};
+
+/// The guides of a form: a form without padding places its padding guides 5 pixels in
+/// on every side.
+class FK_API TCustomFormGuidelines : public TWinControlGuidelines {
+  FK_CLASS(TCustomFormGuidelines, TWinControlGuidelines)
+  /// Raises `EInvalidCast` `sKilnGuidelinesWrongClass` for a component that is not a form.
+  void Initialize(TComponent* AComponent, TComponent* AContainer) override;
+
+protected:
+  TRect GuidePadding() const override;
+};
+
 /// Creates the Kiln designer and registers it with `Designers`.
 FK_API void InitializeKilnDesigner(const IPtr<IDesignEnvironment>& Environment);
 /// What the package does when it loads: the framework's classes, its custom modules
-/// (the core must run), the pixels-per-inch hook, and its designer's initializer.
+/// (the core must run), the editor registries joined to the core, the guides of
+/// controls, the pixels-per-inch hook, and its designer's initializer.
 FK_API void RegisterKilnDesignPackage();
 
 //===----------------------------------------------------------------------===//
@@ -159,7 +236,7 @@ FK_API TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root);
 //===----------------------------------------------------------------------===//
 
 /// The item of a control: its bounds in the parent's client area, the parent's item
-/// above it, its own client area for children, and guides at its four edges.
+/// above it, its own client area for children, and the guides registered for its class.
 class FK_API TKilnControlItem : public TComponentItem {
   FK_CLASS(TKilnControlItem, TComponentItem)
   FK_INTERFACES(IItemEx, IComponentItem)
@@ -183,7 +260,11 @@ class FK_API TKilnControlItem : public TComponentItem {
   void SetParent(const IPtr<IItem>& Parent) override;
   void Show() override;
   void ZOrder(bool Front) override;
-  bool HasGuidelines() override { return GetParent() != nullptr; }
+  /// The bounds with the control's margins around them; the container's own bounds.
+  TRect GetPaddedBoundsRect() override;
+  /// Every control takes part, the container too: its padding is where its children stop.
+  bool HasGuidelines() override { return true; }
+  /// The guides registered for the control's class, in the surface's coordinates.
   IPtr<IItemGuidelines> GetItemGuidelines() override;
 
 private:
@@ -240,24 +321,42 @@ private:
   bool FActive = true;
 };
 
-/// Drag boxes drawn on the surface's canvas.
-class FK_API TKilnDragBoxes : public TXorDragBoxes {
+/// Drag boxes drawn on the surface's canvas. The guide lines of the drag go to the
+/// surface's painter, so that the end of the drag takes them away.
+class FK_API TKilnDragBoxes : public TXorDragBoxes, public IGuidelinePainter {
   FK_CLASS(TKilnDragBoxes, TXorDragBoxes)
-  explicit TKilnDragBoxes(TCanvas* Canvas = nullptr) : FCanvas(Canvas) {}
+  FK_INTERFACES(IGuidelinePainter)
+  explicit TKilnDragBoxes(TCanvas* Canvas = nullptr, IPtr<IGuidelinePainter> Painter = nullptr)
+      : FCanvas(Canvas), FPainter(std::move(Painter)) {}
+
+  void AddGuide(const TRect& Rect, TGuideType GuideType) override {
+    if (FPainter) FPainter->AddGuide(Rect, GuideType);
+  }
+  void BeginPaint() override {
+    if (FPainter) FPainter->BeginPaint();
+  }
+  void ClearGuides() override {
+    if (FPainter) FPainter->ClearGuides();
+  }
+  void EndPaint() override {
+    if (FPainter) FPainter->EndPaint();
+  }
 
 protected:
   void DrawBox(const TRect& Rect, TDesignBoxStyle Style) override;
 
 private:
   TCanvas* FCanvas;
+  IPtr<IGuidelinePainter> FPainter; // the surface, for as long as the drag lasts
 };
 
 /// The surface of one Kiln module. Its design coordinates are the client area of the
 /// root's window; global coordinates are the same. Input arrives through `MouseDown`,
-/// `MouseMove`, `MouseUp` and `KeyDown`, as the window would deliver it.
-class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSurface {
+/// `MouseMove`, `MouseUp` and `KeyDown`, as the window would deliver it. The surface
+/// draws the guide lines of a drag on its canvas itself.
+class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSurface, public IGuidelinePainter {
   FK_CLASS(TKilnSurface, TInterfacedObject)
-  FK_INTERFACES(IComponentDesignSurface)
+  FK_INTERFACES(IComponentDesignSurface, IGuidelinePainter)
   TKilnSurface() : FCanvas(new TCanvas) {}
   TKilnSurface(TKilnRoot* Root, TWinControl* Container);
   void BeforeDestruction() override;
@@ -287,7 +386,8 @@ class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSur
   IPtr<IItem> FindNextItem(const IPtr<IItem>& Item, bool Forward) override;
   void FocusSurface() override { FFocused = true; }
   IPtr<IGrabHandles> GetGrabHandles() override { return FHandles; }
-  IPtr<IGuidelinePainter> GetGuidelinePainter() override { return nullptr; }
+  /// The surface paints the guide lines itself.
+  IPtr<IGuidelinePainter> GetGuidelinePainter() override { return IPtr<IGuidelinePainter>(this); }
   IPtr<IItem> GetItems(int Index) override;
   int GetItemsCount() override;
   TPoint GetOrigin() override { return {0, 0}; }
@@ -311,8 +411,22 @@ class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSur
   void SetOptions(const TDesignSurfaceOptions& Options) override { FOptions = Options; }
   void SetInitializing(bool Value) override { FInitializing = Value; }
 
+  // IGuidelinePainter: each line a "MoveTo" and a "LineTo" on the canvas -----------------
+  void AddGuide(const TRect& Rect, TGuideType GuideType) override;
+  void BeginPaint() override {}
+  void ClearGuides() override { FGuideLines.clear(); }
+  void EndPaint() override {}
+
   const TDesignSurfaceOptions& Options() const noexcept { return FOptions; }
   bool Focused() const noexcept { return FFocused; }
+  /// A guide line on show.
+  struct TGuideLine {
+    TRect Rect;
+    TGuideType Type;
+    friend bool operator==(const TGuideLine&, const TGuideLine&) = default;
+  };
+  /// The guide lines on show, in the order they were added.
+  const std::vector<TGuideLine>& GuideLines() const noexcept { return FGuideLines; }
 
 private:
   TKilnRoot* FRoot = nullptr;       // the root holds this surface
@@ -320,6 +434,7 @@ private:
   IPtr<IDesignSurfaceListener> FListener;
   IPtr<TKilnGrabHandles> FHandles;
   TObjectGuard<TCanvas> FCanvas;
+  std::vector<TGuideLine> FGuideLines;
   TDesignSurfaceOptions FOptions;
   TPoint FCursor;
   bool FFocused = false;

@@ -2,6 +2,7 @@
 #include "frameworks/kiln/design/KilnDesign.h"
 
 #include "core/Designers.h"
+#include "editors/EditorRegistry.h"
 #include "frameworks/kiln/Kiln.h"
 
 #include <sys/stat.h>
@@ -106,9 +107,13 @@ void InitializeKilnDesigner(const IPtr<IDesignEnvironment>& Environment) {
 
 void RegisterKilnDesignPackage() {
   InitializeKiln();
+  InitializeDesignEditors(); // the registries the package's editors and guides go to
   RegisterCustomModule(TForm::StaticClass(), TKilnCustomModule::StaticClass());
   RegisterCustomModule(TFrame::StaticClass(), TKilnFrameModule::StaticClass());
   RegisterCustomModule(TDataModule::StaticClass(), TKilnDataModuleModule::StaticClass());
+  RegisterComponentGuidelines(TControl::StaticClass(), TControlGuidelines::StaticClass());
+  RegisterComponentGuidelines(TWinControl::StaticClass(), TWinControlGuidelines::StaticClass());
+  RegisterComponentGuidelines(TCustomForm::StaticClass(), TCustomFormGuidelines::StaticClass());
   // Creation on a surface scales by the pixels per inch of the parent control.
   GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {
     auto* Control = dynamic_cast<TControl*>(ExtractComponent(Item));

@@ -8,32 +8,23 @@ FK_IMPLEMENT(TKilnIconItem, "KilnDesign") {}
 
 namespace {
 
-/// Guides at the four edges of a control, in its parent's client coordinates.
-class TKilnEdgeGuides : public TInterfacedObject, public IItemGuidelines {
-  FK_CLASS(TKilnEdgeGuides, TInterfacedObject)
+/// A component's guides as the surface asks for them: the same kinds, and the offsets
+/// already in the container's coordinates.
+class TKilnItemGuides : public TInterfacedObject, public IItemGuidelines {
+  FK_CLASS(TKilnItemGuides, TInterfacedObject)
   FK_INTERFACES(IItemGuidelines)
-  explicit TKilnEdgeGuides(const TRect& Bounds = {}) : FBounds(Bounds) {}
-  int GetCount() override { return 4; }
-  TGuideType GetDesignerGuideType(int Index) override {
-    static constexpr TGuideType Types[] = {gtAlignLeft, gtAlignTop, gtAlignRight, gtAlignBottom};
-    return Types[Check(Index)];
-  }
-  int GetDesignerGuideOffset(int Index) override {
-    const int Offsets[] = {FBounds.Left, FBounds.Top, FBounds.Right, FBounds.Bottom};
-    return Offsets[Check(Index)];
-  }
+  explicit TKilnItemGuides(IPtr<IComponentGuidelines> Guides) : FGuides(std::move(Guides)) {}
+  int GetCount() override { return FGuides->GetCount(); }
+  TGuideType GetDesignerGuideType(int Index) override { return FGuides->GetDesignerGuideType(Index); }
+  int GetDesignerGuideOffset(int Index) override { return FGuides->GetDesignerGuideOffset(Index); }
 
 private:
-  static int Check(int Index) {
-    if (Index < 0 || Index > 3) throw EListError(SListIndexError, Index);
-    return Index;
-  }
-  TRect FBounds;
+  IPtr<IComponentGuidelines> FGuides;
 };
 
 } // namespace
 
-FK_IMPLEMENT(TKilnEdgeGuides, "KilnDesign") {}
+FK_IMPLEMENT(TKilnItemGuides, "KilnDesign") {}
 
 //===----------------------------------------------------------------------===//
 // Controls
@@ -122,8 +113,16 @@ void TKilnControlItem::ZOrder(bool Front) {
   }
 }
 
+TRect TKilnControlItem::GetPaddedBoundsRect() {
+  TRect R = GetBoundsRect();
+  if (Control() == FSurface->Container()) return R;
+  const TRect M = Control()->Margins();
+  return TRect{R.Left - M.Left, R.Top - M.Top, R.Right + M.Right, R.Bottom + M.Bottom};
+}
+
 IPtr<IItemGuidelines> TKilnControlItem::GetItemGuidelines() {
-  return NewAs<IItemGuidelines, TKilnEdgeGuides>(GetBoundsRect());
+  // The surface's coordinates are the container's client area.
+  return NewAs<IItemGuidelines, TKilnItemGuides>(GuidelinesFor(FDesigner, Control(), FSurface->Container()));
 }
 
 //===----------------------------------------------------------------------===//

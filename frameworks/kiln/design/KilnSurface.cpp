@@ -131,7 +131,7 @@ IPtr<IItem> TKilnSurface::ItemAtPoint(int X, int Y) {
 }
 
 IPtr<IDragBoxes> TKilnSurface::BeginDrag(const IPtr<IItem>&, const TPoint&) {
-  return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas.Get());
+  return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas.Get(), GetGuidelinePainter());
 }
 
 IPtr<IItem> TKilnSurface::CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) {
