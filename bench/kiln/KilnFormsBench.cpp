@@ -15,33 +15,21 @@
 //   build/release/bench/kiln/fk_bench_kiln_forms --benchmark_min_time=0.2
 //
 //===----------------------------------------------------------------------===//
+#include "bench/BenchTiming.h"
 #include "frameworks/kiln/Kiln.h"
 #include "platform/Filer.h"
 
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
-#include <chrono>
 #include <functional>
 
 using namespace formkit;
 
 namespace {
 
-using TClock = std::chrono::steady_clock;
-
-double SecondsOf(const std::function<void()>& Step) {
-  auto T0 = TClock::now();
-  Step();
-  return std::chrono::duration<double>(TClock::now() - T0).count();
-}
-
-/// The best of a few runs: the baseline's noise floor.
-double BestOf(int Reps, const std::function<void()>& Step) {
-  double Best = 1e9;
-  for (int I = 0; I < Reps; ++I) Best = std::min(Best, SecondsOf(Step));
-  return Best;
-}
+using bench::BestOf;
+using bench::SecondsOf;
 
 constexpr int PanelCount = 50;
 

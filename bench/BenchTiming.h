@@ -1,0 +1,35 @@
+//===- bench/BenchTiming.h - Timing a step and its baseline ---------------===//
+//
+// The two clocks every benchmark of the project reads: the time of one step, and
+// the best of a few runs of a baseline measured in the same run, so that a figure
+// can be reported as a ratio (`x_base`) rather than as time on a shared machine.
+//
+// Example:
+//   double Base = bench::BestOf(5, [&] { for (auto* B : Buttons) B->SetLeft(1); });
+//   double Mine = bench::SecondsOf([&] { Left->SetValue("1"); });
+//   State.counters["x_base"] = Mine / Base;
+//
+//===----------------------------------------------------------------------===//
+#pragma once
+
+#include <algorithm>
+#include <chrono>
+#include <functional>
+
+namespace formkit::bench {
+
+/// The seconds `Step` takes.
+inline double SecondsOf(const std::function<void()>& Step) {
+  auto T0 = std::chrono::steady_clock::now();
+  Step();
+  return std::chrono::duration<double>(std::chrono::steady_clock::now() - T0).count();
+}
+
+/// The best of `Reps` runs of `Step`: the baseline's noise floor.
+inline double BestOf(int Reps, const std::function<void()>& Step) {
+  double Best = 1e9;
+  for (int I = 0; I < Reps; ++I) Best = std::min(Best, SecondsOf(Step));
+  return Best;
+}
+
+} // namespace formkit::bench
