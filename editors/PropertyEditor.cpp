@@ -4,6 +4,8 @@
 #include "platform/Lists.h"
 #include "platform/TypInfo.h"
 
+#include <typeinfo>
+
 namespace formkit {
 
 FK_IMPLEMENT(TPropertyEditor, "DesignEditors") {}
@@ -112,15 +114,15 @@ void TPropertyEditor::Revert() {
 }
 
 bool TPropertyEditor::ValueAvailable() {
-  // This runs for every pair of every listed editor: the class test is made once for each
-  // run of objects of one class, and no dynamic cast is needed.
-  TClass LastClass = nullptr;
+  // This runs for every pair of every listed editor: the component test is made once for
+  // each run of objects of one C++ type, which costs one load per pair.
+  const std::type_info* LastType = nullptr;
   bool LastIsComponent = false;
   for (int I = 0; I < FPropCount; ++I) {
     TPersistent* Instance = FPropList[I].Instance;
-    if (TClass Class = Instance->ClassType(); Class != LastClass) {
-      LastClass = Class;
-      LastIsComponent = Class->InheritsFrom(TComponent::StaticClass());
+    if (const std::type_info* Type = &typeid(*Instance); Type != LastType) {
+      LastType = Type;
+      LastIsComponent = dynamic_cast<TComponent*>(Instance) != nullptr;
     }
     if (!LastIsComponent || !static_cast<TComponent*>(Instance)->ComponentStyle().Contains(csCheckPropAvail))
       continue;
