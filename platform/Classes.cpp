@@ -113,9 +113,9 @@ void TComponent::UnindexName(TComponent* Component) {
 namespace detail {
 /// The counted stand-in of one component. The component knows its wrapper (to cut the
 /// link when it goes); the wrapper knows its component until then.
-class TComponentReference : public TInterfacedObject, public IComponentReference {
+class TComponentReference : public TInterfacedObject, public IComponentReferenceSource {
   FK_CLASS(TComponentReference, TInterfacedObject)
-  FK_INTERFACES(IComponentReference)
+  FK_INTERFACES(IComponentReferenceSource)
 
   explicit TComponentReference(TComponent* Component) : FComponent(Component) {}
   TComponent* GetComponent() override { return FComponent; }
@@ -132,16 +132,16 @@ private:
 FK_IMPLEMENT(TComponentReference, "Classes") {}
 } // namespace detail
 
-IPtr<IComponentReference> ComponentReference(TComponent* Component) {
+IPtr<IComponentReferenceSource> ComponentReference(TComponent* Component) {
   if (!Component) return nullptr;
-  if (Component->FReference) return IPtr<IComponentReference>(Component->FReference);
+  if (Component->FReference) return IPtr<IComponentReferenceSource>(Component->FReference);
   IPtr<detail::TComponentReference> Ref = New<detail::TComponentReference>(Component);
   Component->FReference = Ref.Get();
   return Ref;
 }
 
 TComponent* ReferencedComponent(const IPtr<IInterface>& Reference) {
-  IPtr<IComponentReference> Ref = QueryAs<IComponentReference>(Reference);
+  IPtr<IComponentReferenceSource> Ref = QueryAs<IComponentReferenceSource>(Reference);
   return Ref ? Ref->GetComponent() : nullptr;
 }
 

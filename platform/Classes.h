@@ -123,17 +123,17 @@ struct FK_API IDesignerNotify : IInterface {
 /// which hears of the component's destruction and answers null from then on.
 ///
 /// Example:
-///   IPtr<IComponentReference> Ref = ComponentReference(Button);
+///   IPtr<IComponentReferenceSource> Ref = ComponentReference(Button);
 ///   Button->Destroy();
 ///   Ref->GetComponent();   // null, and Ref is still safe to release
-struct FK_API IComponentReference : IInterface {
-  FK_INTERFACE(IComponentReference, IInterface, "{6C1B8E52-3F0A-4D7E-B8C9-2E5F1A7D9043}")
+struct FK_API IComponentReferenceSource : IInterface {
+  FK_INTERFACE(IComponentReferenceSource, IInterface, "{E28B1858-EC86-4559-8FCD-6B4F824151ED}")
   /// The component, or null once it is gone.
   virtual TComponent* GetComponent() = 0;
 };
 
 /// The one reference wrapper of `Component` (made on first request); null for null.
-FK_API IPtr<IComponentReference> ComponentReference(TComponent* Component);
+FK_API IPtr<IComponentReferenceSource> ComponentReference(TComponent* Component);
 /// The component behind an interface reference: the wrapper's component, or null for
 /// anything else (a counted object that is not a component).
 FK_API TComponent* ReferencedComponent(const IPtr<IInterface>& Reference);
@@ -305,7 +305,7 @@ protected:
 
 private:
   friend FK_API void FreeComponentsTogether(const std::vector<TComponent*>& Components);
-  friend FK_API IPtr<IComponentReference> ComponentReference(TComponent* Component);
+  friend FK_API IPtr<IComponentReferenceSource> ComponentReference(TComponent* Component);
   friend class detail::TComponentReference;
   void Insert(TComponent* Component);
   void Remove(TComponent* Component);

@@ -128,4 +128,23 @@ IPtr<IInterface> TVariant::AsInterface() const {
 
 bool operator==(const TVariant& A, const TVariant& B) { return A.FValue == B.FValue; }
 
+TVariant VarAsType(const TVariant& V, std::uint16_t To) {
+  switch (To) {
+  case varEmpty: return TVariant();
+  case varNull: return TVariant::Null();
+  case varInteger: return TVariant(V.AsInteger());
+  case varInt64: return TVariant(V.AsInt64());
+  case varDouble: return TVariant(V.AsDouble());
+  case varDate: return TVariant::Date(V.AsDouble());
+  case varBoolean: return TVariant(V.AsBoolean());
+  case 0x0100: // the 8-bit string: every string of the library is UTF-8
+  case varUString: return TVariant(V.AsString());
+  default:
+    throw EVariantTypeCastError(SVarTypeCouldNotConvert, VarTypeAsText(V.VarType()),
+                                VarTypeAsText(static_cast<TVarType>(To)));
+  }
+}
+
+String VarToStrDef(const TVariant& V, const String& Default) { return V.IsNull() ? Default : V.AsString(); }
+
 } // namespace formkit

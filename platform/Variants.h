@@ -81,6 +81,13 @@ private:
       FValue;
 };
 
+/// `V` converted to type code `To`: empty, null, integer, Int64, double, date, Boolean or
+/// string (256 and 258 both give the string). Raises `EVariantTypeCastError` for a
+/// conversion that cannot be made and for a type this library's variants do not hold.
+FK_API TVariant VarAsType(const TVariant& V, std::uint16_t To);
+/// `V` as text; `Default` for a null value. Raises `EVariantTypeCastError` for an interface.
+FK_API String VarToStrDef(const TVariant& V, const String& Default);
+
 /// The name of a variant type code as the messages show it ("Integer", "UnicodeString", ...).
 FK_API String VarTypeAsText(TVarType Type);
 

@@ -132,7 +132,7 @@ TEST(ComponentReferences, AWrapperOutlivesItsComponentSafely) {
   Holder->Peer = ComponentReference(Target);
   EXPECT_EQ(Target, ReferencedComponent(Holder->Peer));
   // One wrapper a component: asking twice gives the same one.
-  EXPECT_EQ(ComponentReference(Target).Get(), QueryAs<IComponentReference>(Holder->Peer).Get());
+  EXPECT_EQ(ComponentReference(Target).Get(), QueryAs<IComponentReferenceSource>(Holder->Peer).Get());
   EXPECT_EQ(0, Target->InterfaceTally());
   Target->Destroy();
   EXPECT_EQ(nullptr, ReferencedComponent(Holder->Peer));
