@@ -82,9 +82,9 @@ struct FK_API IDesignEnvironment : IInterface {
   /// module's rename check, after the module record accepted the name and
   /// `EvComponentRenamedEvent` went out.
   virtual void ComponentRenamed(const String& CurName, const String& NewName) = 0;
-  /// A component named `Name` of any open module, or null. Called by a module's name
-  /// lookup (`IDesigner::GetComponent`) when the module itself has no such component. The
-  /// component stays its own module's.
+  /// A component named `Name` of any open module, or null: the host's own finder of
+  /// roots. A module's name lookup (`IDesigner::GetComponent`) does not ask it; that one
+  /// finds the open modules through their designers. The component stays its own module's.
   virtual TComponent* FindGlobalComponent(const String& Name) = 0;
   /// Shows the dialog of a positioning command (align, size, scale, tab order, creation
   /// order, template) for the active module. Called when the user asks a module for that
@@ -176,13 +176,50 @@ struct FK_API IDesignEnvironment : IInterface {
   /// removed from the module). Called before the design notification listeners hear of
   /// it; `Item` is still alive during the call and must not be kept.
   virtual void ItemDeleted(const IPtr<IDesigner>& ADesigner, TPersistent* Item) = 0;
+  /// The modifier keys and mouse buttons held now, as the host's keyboard and mouse
+  /// report them (`ssCtrl`, `ssLeft`, ...). Called by `IDesigner::GetShiftState`, for
+  /// an editor that acts differently on a Ctrl-click.
+  virtual TShiftState GetShiftState() = 0;
 };
 
-/// A component's identity as the host's source editing needs it.
-struct FK_API TCompInfo {
-  String Name;
-  String ClassName;
-  String UnitName;
+/// The events of one object (a component, a sub-object, a collection item) as the host's
+/// source editing needs them, without type information: the names and handlers of its
+/// event properties, sorted by name, and the objects below it that have events too. The
+/// core makes one (`TCompInfo`) for each call that hands it to the host; the host may keep
+/// it for the call only, since the object it describes belongs to the module.
+///
+/// Example (the host, renaming a component's handlers with it):
+///   for (int I = 0; I < Info->GetEventCount(); ++I)
+///     if (String Handler = Info->GetEventValue(I); !Handler.empty()) Rename(Handler);
+struct FK_API ICompInfo : IInterface {
+  FK_INTERFACE(ICompInfo, IInterface, "{E1065483-5709-4C88-8011-F38B70DD1FAA}")
+  /// Clears event `Index`: back to the ancestor's handler when the module can revert it,
+  /// else unassigned; the module is then modified. Raises `EListError` for a bad index.
+  virtual void ClearEvent(int Index) = 0;
+  /// The class name of the object ("TForm1", "TButton").
+  virtual String GetClassName() = 0;
+  /// The class name with its unit ("Unit1.TForm1").
+  virtual String GetQualifiedClassName() = 0;
+  /// The number of event properties.
+  virtual int GetEventCount() = 0;
+  /// The property of event `Index`. Raises `EListError` for a bad index.
+  virtual PPropInfo GetEventInfo(int Index) = 0;
+  /// The signature of event `Index`, new at each call.
+  virtual IPtr<IEventInfo> GetIEventInfo(int Index) = 0;
+  /// The name of event `Index` ("OnClick").
+  virtual String GetEventName(int Index) = 0;
+  /// The name of the handler event `Index` holds when it is a method of the module;
+  /// empty when it holds nothing or a method of something else.
+  virtual String GetEventValue(int Index) = 0;
+  /// The object as a design object, new at each call.
+  virtual IPtr<IDesignObject> GetComponentHandle() = 0;
+  /// The object's name path ("Button1", "Form1.Button1.Font").
+  virtual String GetNamePath() = 0;
+  /// The number of objects below: the sub-objects, then a collection's items.
+  virtual int GetSubInfoCount() = 0;
+  /// The description of object `Index` below; null when that sub-object property holds
+  /// nothing. Raises `EListError` for a bad index.
+  virtual IPtr<ICompInfo> GetSubInfo(int Index) = 0;
 };
 
 /// The host's record of one open module: its source, its file, its place in the project.
@@ -230,11 +267,11 @@ struct FK_API IDesignerModule : IInterface {
   /// `NewName` (empty when it loses its name): the host renames it in the source, or
   /// raises to refuse. Called by the root's rename check; not for components that come
   /// from an ancestor, nor while an ancestor's update renames them.
-  virtual void RenameComponent(const TCompInfo& Info, const String& CurName, const String& NewName) = 0;
+  virtual void RenameComponent(const IPtr<ICompInfo>& Info, const String& CurName, const String& NewName) = 0;
   /// The root component described by `Info` is to be called `NewName`: the host checks
   /// the name against the project and the source, and raises to refuse. Called by the
   /// root's rename check before the root is renamed.
-  virtual void ValidateComponentName(const TCompInfo& Info, const String& NewName) = 0;
+  virtual void ValidateComponentName(const IPtr<ICompInfo>& Info, const String& NewName) = 0;
   /// Renames method `CurName` of the source to `NewName`. Called by
   /// `IDesigner::RenameMethod`.
   virtual void RenameMethod(const String& CurName, const String& NewName) = 0;

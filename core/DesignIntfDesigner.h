@@ -78,32 +78,37 @@ struct FK_API IDesigner60 : IDesignerNotify {
   /// A name for a new component of class `BaseName` ("TButton" gives "Button1",
   /// "Button2", ...) that no component of the module or of its descendants has.
   virtual String UniqueName(const String& BaseName) = 0;
-  /// The component of that name: the root, one of the module's (a dotted path reaches
-  /// into nested components), else one of any open module through the host; null when
-  /// none.
+  /// The component of that name: one of the module's (a dotted path reaches into nested
+  /// frames), "Form2.Button1" one of the open module whose root is Form2, a bare root name
+  /// that root component of any open module; null when none.
   virtual TComponent* GetComponent(const String& Name) = 0;
   /// The name by which this module refers to `Component`: its name when the module owns
-  /// it, else the dotted path from its module's root; empty for null.
+  /// it (or it is a root), else its owner's name path, a point and its name
+  /// ("Frame1.Button1", "Form2.Button1"); empty for null.
   virtual String GetComponentName(TComponent* Component) = 0;
-  /// Calls `Proc` with the name of each named component of the module whose class fits
-  /// the class type `TypeData` (any class when null): the value list of a reference
-  /// property.
+  /// Calls `Proc` with the name of each named component whose class fits the class type
+  /// `TypeData` (any class when null): the module's own, those of its nested frames
+  /// ("Frame1.Button1"), then those of the modules it links to ("Form2", "Form2.Button1").
+  /// The value list of a reference property.
   virtual void GetComponentNames(const TTypeData* TypeData, const TGetStrProc& Proc) = 0;
   /// The persistent of that name, as `GetComponent` finds it.
   virtual TPersistent* GetObject(const String& Name) = 0;
-  /// The name of `Instance`: as `GetComponentName` for a component, its name path
-  /// otherwise.
+  /// The name of `Instance`: as `GetComponentName` for a component; for an object below
+  /// a component, that component's name followed by the rest of the name path
+  /// ("Frame1.Button1.Font").
   virtual String GetObjectName(TPersistent* Instance) = 0;
   /// As `GetComponentNames`.
   virtual void GetObjectNames(const TTypeData* TypeData, const TGetStrProc& Proc) = 0;
   /// The root component, owned by the module; null while it is dormant or closed.
   virtual TComponent* GetRoot() = 0;
-  /// The class name of the module's root class. Raises `EComponentDesignerException`
-  /// "Root class not found: "%s"" when its designer has no registration for it.
+  /// The class name of the module's root: the designed class ("TForm1") once the root
+  /// exists, else the framework's root class. Raises `EComponentDesignerException`
+  /// "Root class not found: "%s"" when there is no root and its designer has no
+  /// registration for the class.
   virtual String GetRootClassName() = 0;
   // Linking across modules
   /// Whether this module may refer to `Component` as things stand: it belongs to this
-  /// module.
+  /// module or to a module this one links to. Asks the host for the links.
   virtual bool IsComponentLinkable(TComponent* Component) = 0;
   /// Lets this module refer to `Component` of another module: the host adds the other
   /// module to the source.
@@ -196,8 +201,8 @@ struct FK_API IDesigner200 : IDesigner170 {
 /// Adds the question whether a handler comes from the ancestor.
 struct FK_API IDesigner290 : IDesigner200 {
   FK_INTERFACE(IDesigner290, IDesigner200, "{A92282B6-AC17-59F4-AE9F-F2D0AC8473B6}")
-  /// Whether `Method` is a published method of the ancestor module's root class; false
-  /// without an ancestor.
+  /// Whether `Method` is a handler the module inherits: the parent of the root's class
+  /// knows its code. False for a module without an ancestor.
   virtual bool MethodFromAncestor(const TMethod& Method) = 0;
 };
 /// The interface of a designed module: the newest of the chain.
@@ -205,6 +210,9 @@ struct FK_API IDesigner : IDesigner290 {
   FK_INTERFACE(IDesigner, IDesigner290, "{90FD7103-D315-50DE-86E9-ECC178430A84}")
   /// Whether the module's source may not be changed (the host's module record says so).
   virtual bool IsSourceReadOnly() = 0;
+  /// The modifier keys and mouse buttons held now (the Ctrl key, the left button, ...), as
+  /// the host's keyboard and mouse report them; empty when nothing is held.
+  virtual TShiftState GetShiftState() = 0;
 };
 
 } // namespace formkit

@@ -24,7 +24,16 @@ std::function<void(const IPtr<IUpdateManager>&)> TRootHooks::UpdateManagerModifi
 std::function<void(const IPtr<IUpdateManager>&, TPersistent*)> TRootHooks::UpdateManagerRemoved;
 std::function<bool(const IPtr<IUpdateManager>&, const String&)> TRootHooks::UpdateManagerNameExists;
 std::function<IPtr<IComponentEditor>(TComponent*, const IPtr<IDesigner>&)> TRootHooks::GetComponentEditor;
-std::function<void*(TComponentRoot&, const String&)> TRootHooks::CreateSubClassMethod;
+std::function<TComponent*(const IPtr<IUpdateManager>&)> TRootHooks::UpdateManagerComponent;
+std::function<void(const IPtr<IUpdateManager>&, const String&, const String&)> TRootHooks::UpdateManagerRenameDescendents;
+std::function<bool(const IPtr<IUpdateManager>&, TPersistent*, PPropInfo)> TRootHooks::UpdateManagerCanRevert;
+std::function<void(const IPtr<IUpdateManager>&, TPersistent*, PPropInfo)> TRootHooks::UpdateManagerRevert;
+std::function<void(TComponent*, const String&, const String&, TClass)> TRootHooks::CreateSubClass;
+std::function<void(TComponent*, const String&, const String&)> TRootHooks::RenameSubClass;
+std::function<void*(TComponent*, const String&)> TRootHooks::CreateSubClassMethod;
+std::function<void(TComponent*, void*, const String&)> TRootHooks::RenameSubClassMethod;
+std::function<void(TComponent*, void*)> TRootHooks::DestroySubClassMethod;
+std::function<void(TComponentRoot&, TComponent*, const String&, const String&)> TRootHooks::NotifyFormEditorRenamed;
 std::function<void(TComponentRoot&, bool)> TRootHooks::DeleteSelection;
 std::function<void(TComponentRoot&)> TRootHooks::SaveModule;
 std::function<bool(TClass)> TRootHooks::IsProxyClass;
@@ -163,6 +172,9 @@ TComponent* TComponentRoot::CreateRootInstance(const String& ClassName) {
     }
     FRoot->SetAncestor(true);
     FCreateFrameManagers = true;
+  } else if (TRootHooks::CreateSubClass) {
+    // The module's own class, on the framework's: where its handlers get their codes.
+    TRootHooks::CreateSubClass(FRoot, ClassName, FModule ? FModule->GetUnitName() : String(), GetRootClass());
   }
   return FRoot;
 }
@@ -192,7 +204,11 @@ String TComponentRoot::GetAncestorName() {
   return C->Parent ? C->Parent->ClassName : "";
 }
 
-String TComponentRoot::GetRootClassName() { return GetRootClass()->ClassName; }
+String TComponentRoot::GetRootClassName() {
+  // The designed class once there is a root ("TForm1"), so that the root's handlers are
+  // named after it; the framework's class before.
+  return FRoot ? FRoot->ClassName() : GetRootClass()->ClassName;
+}
 
 String TComponentRoot::GetRootName() { return FRoot ? FRoot->Name() : FRootName; }
 
@@ -316,6 +332,28 @@ void TComponentRoot::ModifiedUpdateNotification() {
   if (FRootUpdateManager) TRootHooks::UpdateManagerModified(FRootUpdateManager);
   for (int I = 0; FUpdateManagers && I < FUpdateManagers->GetCount(); ++I)
     TRootHooks::UpdateManagerModified(QueryAs<IUpdateManager>(FUpdateManagers->Get(I)));
+}
+
+namespace {
+/// The object behind a manager: two references to one manager may differ.
+const void* ManagerIdentity(const IPtr<IUpdateManager>& Manager) {
+  if (auto Impl = QueryAs<IImplementation>(Manager)) return Impl->GetInstance();
+  return QueryAs<IInterface>(Manager).Get();
+}
+} // namespace
+
+void TComponentRoot::Updating(const IPtr<IUpdateManager>&) { FIgnoreRename = true; }
+
+void TComponentRoot::Updated(const IPtr<IUpdateManager>& Manager) {
+  FIgnoreRename = false;
+  if (FSurface) {
+    FSurface->RefreshItems();
+    FSurface->UpdateSurface();
+  }
+  if (FRootUpdateManager && TRootHooks::UpdateManagerModified &&
+      ManagerIdentity(FRootUpdateManager) != ManagerIdentity(Manager))
+    TRootHooks::UpdateManagerModified(FRootUpdateManager);
+  DesignNotificationDescendantUpdated(AsDesigner());
 }
 
 //===----------------------------------------------------------------------===//

@@ -13,7 +13,10 @@
 //
 // The themes live in their own files: lifecycle and state (ComponentRoot.cpp),
 // selection and instances (RootSelection.cpp), creation (RootCreation.cpp),
-// names (RootNames.cpp), the designer interface's forwards (RootDesigner.cpp).
+// names and their lookup across modules (RootNames.cpp), handlers bound to
+// methods (RootMethods.cpp), the renames and handlers of a paste
+// (RootPaste.cpp), the host's view of an object's events (RootCompInfo.cpp),
+// the designer interface's forwards (RootDesigner.cpp).
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -21,11 +24,14 @@
 #include "core/DesignerTypes.h"
 #include "core/root/ComponentDesignSurface.h"
 #include "core/root/RootHooks.h"
+#include "core/root/RootNames.h"
 #include "platform/Streams.h"
 
 #include <unordered_map>
 
 namespace formkit {
+
+class TReader;
 
 FK_EXCEPTION(ECannotDeleteNonComponentException, EComponentDesignerException);
 
@@ -195,9 +201,89 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   void ValidateComponent(TComponent* Component);
 
   // Names ---------------------------------------------------------------------------------
+  /// A free name for a component of class `BaseName`: "TButton" gives "Button1",
+  /// "Button2", ... (a leading "T" goes when more follows), free in the module and, with
+  /// inheritance support, in its descendants. Cost: one lookup per number tried.
   String UniqueName(const String& BaseName) override;
+  /// Checks a rename before the component framework stores it, and carries it to the
+  /// host's source, the descendants, the form editor, the dependent modules and the
+  /// listeners, in that order. `Component` null or the root component: the module is
+  /// renamed. Raises `EComponentDesignerException`, or what the host raises, to refuse;
+  /// nothing has changed then.
   void ValidateRename(TComponent* Component, const String& CurName, const String& NewName) override;
+  /// Renames component `CurName` of the module through its name's setter; false when
+  /// there is none of that name.
   bool RenameComponent(const String& CurName, const String& NewName);
+  /// The root component of the open module named `Name` (any designer), or null.
+  [[nodiscard]] TComponent* FindRootComponent(const String& Name);
+  /// Called with each name the host gives while it lists the modules this one links to.
+  void AddImportedRoot(const String& Name);
+
+  // Handlers bound to methods -------------------------------------------------------------
+  /// The source's methods that fit `EventInfo`, from the host.
+  void GetMethods(const IPtr<IEventInfo>& EventInfo, const TGetStrProc& Proc);
+  /// Asks the host to insert a call to `InstanceMethod` of `InstanceName` into
+  /// `MethodName`.
+  void ChainCall(const String& MethodName, const String& InstanceName, const String& InstanceMethod,
+                 const IPtr<IEventInfo>& EventInfo);
+  /// Renames method `CurName` of the root's class to `NewName`, keeping its code, so the
+  /// events that hold it follow; nothing when the class has no such method.
+  void RenameRootMethod(const String& CurName, const String& NewName);
+  /// The reader's hook while a module is read: a handler named in the module gets a method
+  /// of the root's class.
+  void FindObjectMethod(TReader* Reader, const String& MethodName, void*& Address, bool& Error);
+  /// Whether `PropInfo` of `Instance` differs from the ancestor's and can go back to it.
+  bool CanRevert(TPersistent* Instance, PPropInfo PropInfo);
+
+  // Updates from the ancestor -------------------------------------------------------------
+  /// An update of the module by its family's update manager begins: renames of what the
+  /// ancestor introduced are let through until `Updated`.
+  void Updating(const IPtr<IUpdateManager>& Manager);
+  /// The update by `Manager` ended: renames are checked again, the surface follows, the
+  /// module's own manager hears of a nested frame's update, and the listeners that care
+  /// hear that a descendant was updated.
+  void Updated(const IPtr<IUpdateManager>& Manager);
+
+  // Paste: renames and handlers of one pasted text ----------------------------------------
+  /// Empties the paste state and sets the reader's hooks for names, references and
+  /// methods to this module's.
+  void BeginPasteRead(TReader* Reader);
+  /// The steps after the components of a paste were read, in order: the handlers get
+  /// their final names (`RenameEvents`); the method text after the components (up to
+  /// its first zero byte) goes to the host with the renames (`InsertMethodSource`); the
+  /// handlers the host did not insert fall back on the class's method of their pasted
+  /// name, or on nothing (`VerifyEvents`); the selected objects' events follow
+  /// (`UpdateEvents`). The paste state stays until `EndPasteRead`.
+  void FinishPasteRead(TReader* Reader);
+  /// Forgets the paste state: the paste is over, or failed.
+  void EndPasteRead() noexcept;
+  /// The reader's hook for a pasted component's name: a name the module has is replaced
+  /// by a free one, and the rename is kept.
+  void ReaderSetName(TReader* Reader, TComponent* Component, String& Name);
+  /// The reader's hook for a reference inside the pasted text: it follows the renames.
+  void ReaderReferenceName(TReader* Reader, String& Name);
+  /// The reader's hook for a handler named in the pasted text: one temporary method per
+  /// distinct name, "@1", "@2", ... (a counter of the process).
+  void ReaderFindMethod(TReader* Reader, const String& MethodName, void*& Address, bool& Error);
+  /// Gives the temporary methods their final names: a handler of a renamed component
+  /// follows it (Button1Click of Button1, now Button3, becomes Button3Click), and a name
+  /// the class has already gets a number (Button3Click2).
+  void RenameEvents();
+  /// The handlers whose names are not in `Inserted` (the methods the host put into the
+  /// source) lose their temporary method and fall back on the class's method of their
+  /// pasted name, or on nothing.
+  void VerifyEvents(TStrings* Inserted);
+  /// Moves the selected objects' events from temporary methods to their final ones.
+  void UpdateEvents();
+  /// Called for each method property met; true stops the walk of the object that has it.
+  using TMethodPropProc = std::function<bool(TPersistent* Instance, PPropInfo PropInfo)>;
+  /// Walks the method properties of each selected object, of the sub-objects below it and
+  /// of the components streamed under it.
+  void IterateMethods(const TMethodPropProc& Proc);
+  /// The components and handlers renamed by the paste under way.
+  const TRenames& Renames() const noexcept { return FRenames; }
+  /// The handlers met by the paste under way.
+  TEvents& Events() noexcept { return FEvents; }
 
   // IFile, IRoot, IInternalRoot: plain reads and forwards ---------------------------------
   bool CheckFileDate() override { return true; }
@@ -280,6 +366,8 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   IPtr<IInterface> GetIDEOptions() override;
   TRect GetScrollRanges(const TPoint& ScrollPosition) override;
   bool MethodFromAncestor(const TMethod& Method) override;
+  /// The host's keys and buttons held now; empty without an environment.
+  TShiftState GetShiftState() override;
 
   IPtr<IDesignEnvironment> GetEnvironment();
 
@@ -303,8 +391,12 @@ protected:
   virtual void InitNewRoot(TComponent* Instance, const String& ClassName) = 0;
   /// The root's constructor and the custom module are done.
   virtual void RootInstanceReady() = 0;
-  /// The topmost component that holds `Component`, or null.
+  /// The root component of any component: the topmost component that holds it, or null.
+  /// Links across modules are made to the module of that root.
   virtual TComponent* RootOf(TComponent* Component) = 0;
+  /// Whether `GetComponentNames` offers the module's root component among the module's
+  /// own names.
+  virtual bool OffersRootName() = 0;
   /// Widget-tree questions.
   virtual int GetControlCount(TComponent* Component) = 0;
   virtual TComponent* GetControl(TComponent* Component, int Index) = 0;
@@ -334,6 +426,14 @@ protected:
   IPtr<TSelections> FSelections;
   IPtr<IInterfaceList> FMarkedItems;
   TMemoryStream* FRootStream = nullptr;
+  /// The modules whose streams refer to this one: their stored streams go stale when a
+  /// name here changes. Kept by the dependency tracking of module writing.
+  std::vector<TComponentRoot*> FDependents;
+  TRenames FRenames;
+  TEvents FEvents;
+  /// The names the host gives of the modules this one links to; filled only during
+  /// `GetComponentNames` and `IsComponentLinkable`.
+  std::vector<String> FImportedRootList;
   std::vector<TComponent*> FModifiableFrames;
   /// Nested frame instance to the root component of the module it copies.
   std::unordered_map<TComponent*, TComponent*> FInliningComponents;
@@ -359,6 +459,19 @@ private:
   void SelectionsChanged();
   void FreeRootStream() noexcept;
   bool IsModifiableFrame(TComponent* Component) const;
+  void ValidateComponentRename(TComponent* Component, const String& CurName, const String& NewName);
+  void ValidateRootRename(const String& CurName, const String& NewName);
+  [[nodiscard]] IPtr<ICompInfo> NewCompInfo(TPersistent* Instance);
+  /// Fills `FImportedRootList` from the host.
+  void ImportRoots();
+  /// Offers the names of `Root` and what it owns, as `GetComponentNames` walks them.
+  void OfferNames(TComponent* Root, const String& Prefix, int Depth, bool IncludeRoot, TClass Wanted,
+                  const TGetStrProc& Proc);
+  /// Reads the method text of a paste after the reader's position, up to a zero byte.
+  [[nodiscard]] static String ReadMethodText(TReader* Reader);
+  /// Raises "`Service` is not available" when the generated classes are not there.
+  static void RequireClassMethods(const char* Service);
+  static const char* const AddingMethod;
 };
 
 } // namespace formkit

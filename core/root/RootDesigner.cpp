@@ -1,8 +1,8 @@
 //===- core/root/RootDesigner.cpp - The designer interface of a module ---===//
 //
-// What `IDesigner` asks of a module beyond selection, creation and names:
-// lookups of components and objects, methods of the designed class (kept by the
-// host's source), and forwards to the host's environment.
+// What `IDesigner` asks of a module beyond selection, creation, names and
+// methods: deletion, links to the project, and forwards to the host's
+// environment.
 //
 //===----------------------------------------------------------------------===//
 #include "core/root/ComponentRoot.h"
@@ -21,111 +21,12 @@ void TComponentRoot::Activate() {
 }
 
 //===----------------------------------------------------------------------===//
-// Methods of the designed class: the host's source holds them
-//===----------------------------------------------------------------------===//
-
-TMethod TComponentRoot::CreateMethod(const String& Name, const TTypeData* TypeData) {
-  return CreateMethod(Name, NewAs<IEventInfo, TEventInfo>(TypeData));
-}
-
-TMethod TComponentRoot::CreateMethod(const String& Name, const IPtr<IEventInfo>& EventInfo) {
-  if (Name.empty()) return {};
-  if (FModule) {
-    FModule->CheckWritable();
-    FModule->CreateMethod(Name, EventInfo);
-  }
-  void* Code = FRoot->MethodAddress(Name);
-  if (!Code) {
-    if (!TRootHooks::CreateSubClassMethod) RaiseServiceNotAvailable("Adding a method to the designed class");
-    Code = TRootHooks::CreateSubClassMethod(*this, Name);
-  }
-  return TMethod{Code, FRoot};
-}
-
-String TComponentRoot::GetMethodName(const TMethod& Method) {
-  if (!Method.Code || Method.Data != static_cast<void*>(static_cast<TObject*>(FRoot))) return "";
-  return FRoot->MethodName(Method.Code);
-}
-
-void TComponentRoot::GetMethods(const TTypeData* TypeData, const TGetStrProc& Proc) {
-  if (FModule) FModule->GetMethods(NewAs<IEventInfo, TEventInfo>(TypeData), Proc);
-}
-
-bool TComponentRoot::MethodExists(const String& Name) { return FModule && FModule->MethodExists(Name, nullptr); }
-
-void TComponentRoot::RenameMethod(const String& CurName, const String& NewName) {
-  if (FModule) FModule->RenameMethod(CurName, NewName);
-}
-
-void TComponentRoot::ShowMethod(const String& Name) {
-  if (FModule) FModule->ShowMethod(Name);
-}
-
-void TComponentRoot::ChainCall(const String& MethodName, const String& InstanceName, const String& InstanceMethod,
-                               const TTypeData* TypeData) {
-  if (FModule) FModule->ChainCall(MethodName, InstanceName, InstanceMethod, NewAs<IEventInfo, TEventInfo>(TypeData));
-}
-
-bool TComponentRoot::MethodFromAncestor(const TMethod& Method) {
-  if (!FAncestorRoot || !Method.Code) return false;
-  TComponent* Ancestor = FAncestorRoot->GetRoot();
-  return Ancestor && !Ancestor->MethodName(Method.Code).empty();
-}
-
-//===----------------------------------------------------------------------===//
-// Components and objects
+// Components and the project
 //===----------------------------------------------------------------------===//
 
 void TComponentRoot::DeleteSelection(bool ADoAll) {
   if (!TRootHooks::DeleteSelection) RaiseServiceNotAvailable("Deleting the selection");
   TRootHooks::DeleteSelection(*this, ADoAll);
-}
-
-TComponent* TComponentRoot::GetComponent(const String& Name) {
-  if (!FRoot) return nullptr;
-  if (SameText(FRoot->Name(), Name)) return FRoot;
-  if (TComponent* C = FindNestedComponent(FRoot, Name)) return C;
-  IPtr<IDesignEnvironment> Env = GetEnvironment();
-  return Env ? Env->FindGlobalComponent(Name) : nullptr;
-}
-
-String TComponentRoot::GetComponentName(TComponent* Component) {
-  if (!Component) return "";
-  if (Component == FRoot || Component->Owner() == FRoot) return Component->Name();
-  // A component of another module or of a nested frame: its path from its root.
-  String Path = Component->Name();
-  for (TComponent* O = Component->Owner(); O && O != FRoot; O = O->Owner()) Path = O->Name() + "." + Path;
-  return Path;
-}
-
-void TComponentRoot::GetComponentNames(const TTypeData* TypeData, const TGetStrProc& Proc) {
-  GetObjectNames(TypeData, Proc);
-}
-
-TPersistent* TComponentRoot::GetObject(const String& Name) { return GetComponent(Name); }
-
-String TComponentRoot::GetObjectName(TPersistent* Instance) {
-  auto* C = dynamic_cast<TComponent*>(Instance);
-  return C ? GetComponentName(C) : (Instance ? Instance->GetNamePath() : "");
-}
-
-void TComponentRoot::GetObjectNames(const TTypeData* TypeData, const TGetStrProc& Proc) {
-  if (!FRoot) return;
-  TClass Wanted = TypeData ? TypeData->ClassRef : nullptr;
-  for (int I = 0; I < FRoot->ComponentCount(); ++I) {
-    TComponent* C = FRoot->Components(I);
-    if (!C->Name().empty() && (!Wanted || C->InheritsFrom(Wanted))) Proc(C->Name());
-  }
-}
-
-bool TComponentRoot::IsComponentLinkable(TComponent* Component) {
-  return Component && (Component == FRoot || RootOf(Component) == FRoot);
-}
-
-void TComponentRoot::MakeComponentLinkable(TComponent* Component) {
-  if (!Component || !FModule) return;
-  TComponent* Target = RootOf(Component);
-  if (Target && Target != FRoot) FModule->MakeComponentLinkable(Target->Name());
 }
 
 bool TComponentRoot::IsComponentHidden(TComponent* Component) {
@@ -153,10 +54,6 @@ void TComponentRoot::ModuleFileNames(String& ImplFileName, String& IntfFileName,
     if (Count > 2) IntfFileName = Module->GetModuleFileName(1);
     if (Count > 1) FormFileName = Module->GetModuleFileName(Count - 1);
   }
-}
-
-void TComponentRoot::Revert(TPersistent*, PPropInfo) {
-  // Reverting to the ancestor's value is the update manager's; without one nothing differs.
 }
 
 //===----------------------------------------------------------------------===//
@@ -198,6 +95,11 @@ void TComponentRoot::ModalEdit(char EditKey, const IPtr<IActivatable>& ReturnWin
   if (IPtr<IDesignEnvironment> Env = GetEnvironment()) Env->ModalEdit(EditKey, ReturnWindow);
 }
 
+TShiftState TComponentRoot::GetShiftState() {
+  IPtr<IDesignEnvironment> Env = GetEnvironment();
+  return Env ? Env->GetShiftState() : TShiftState{};
+}
+
 void TComponentRoot::SelectItemName(const String& PropertyName) {
   if (IPtr<IDesignEnvironment> Env = GetEnvironment()) Env->SelectItemName(PropertyName);
 }
@@ -222,8 +124,6 @@ void TComponentRoot::ShowHelp() {}
 //===----------------------------------------------------------------------===//
 // Files, views, streams: joining with their own units
 //===----------------------------------------------------------------------===//
-
-void TComponentRoot::Rename(const String& NewFileName) { FFileName = ChangeFileExt(NewFileName, ExtractFileExt(FFileName)); }
 
 void TComponentRoot::Save() {
   if (!TRootHooks::SaveModule) RaiseServiceNotAvailable("Saving a module");

@@ -8,6 +8,11 @@
 // cannot be done without its service raises `EComponentDesignerException`
 // "%s is not available".
 //
+// Example (the inheritance support, as its unit starts):
+//   TRootHooks::UpdateManagerNameExists = [](const IPtr<IUpdateManager>& Manager, const String& Name) {
+//     return ManagerOf(Manager)->NameExists(Name);
+//   };
+//
 //===----------------------------------------------------------------------===//
 #pragma once
 
@@ -33,11 +38,40 @@ struct FK_API TRootHooks {
   static std::function<void(const IPtr<IUpdateManager>& Manager, TPersistent* Instance)> UpdateManagerRemoved;
   /// True when a name is taken in the module or one of its descendants.
   static std::function<bool(const IPtr<IUpdateManager>& Manager, const String& Name)> UpdateManagerNameExists;
+  /// The component a manager stands for (its root component or nested frame), or null.
+  static std::function<TComponent*(const IPtr<IUpdateManager>& Manager)> UpdateManagerComponent;
+  /// Renames component `CurName` to `NewName` in every descendant of the manager's module,
+  /// before the module renames its own.
+  static std::function<void(const IPtr<IUpdateManager>& Manager, const String& CurName, const String& NewName)>
+      UpdateManagerRenameDescendents;
+  /// Whether property `PropInfo` of `Instance` differs from the ancestor's and can go back.
+  static std::function<bool(const IPtr<IUpdateManager>& Manager, TPersistent* Instance, PPropInfo PropInfo)>
+      UpdateManagerCanRevert;
+  /// Puts property `PropInfo` of `Instance` back to the ancestor's value.
+  static std::function<void(const IPtr<IUpdateManager>& Manager, TPersistent* Instance, PPropInfo PropInfo)>
+      UpdateManagerRevert;
   /// The component editor of a component (null when none is registered).
   static std::function<IPtr<IComponentEditor>(TComponent* Component, const IPtr<IDesigner>& Designer)>
       GetComponentEditor;
-  /// Adds a method of `Name` to the root's generated class and gives its code.
-  static std::function<void*(TComponentRoot& Root, const String& Name)> CreateSubClassMethod;
+  // Generated classes: the class a designed root stands for, made at run time. Method
+  // codes are tokens below `MaxMethodToken`, never called.
+  /// Moves a new root `Instance` to a generated class `ClassName` of unit `UnitName` that
+  /// descends from `Metaclass`. Unset: the root keeps its framework class.
+  static std::function<void(TComponent* Instance, const String& ClassName, const String& UnitName, TClass Metaclass)>
+      CreateSubClass;
+  /// Renames the generated class of `Instance`; an empty `UnitName` keeps the unit.
+  static std::function<void(TComponent* Instance, const String& ClassName, const String& UnitName)> RenameSubClass;
+  /// The code of method `MethodName` of the class of `Instance`: the one it or a parent
+  /// has, else a new token.
+  static std::function<void*(TComponent* Instance, const String& MethodName)> CreateSubClassMethod;
+  /// Renames the method of code `Token` of the class of `Instance`; the token stays.
+  static std::function<void(TComponent* Instance, void* Token, const String& NewName)> RenameSubClassMethod;
+  /// Removes the method of code `Token` from the class of `Instance`; nothing when absent.
+  static std::function<void(TComponent* Instance, void* Token)> DestroySubClassMethod;
+  /// Tells the module's form editor (the tool services' view of the module) of a rename,
+  /// when the module has one.
+  static std::function<void(TComponentRoot& Root, TComponent* Component, const String& CurName, const String& NewName)>
+      NotifyFormEditorRenamed;
   /// Deletes the selection (clipboard and deletion).
   static std::function<void(TComponentRoot& Root, bool DoAll)> DeleteSelection;
   /// Writes the module and its dependencies (used by `Save`).

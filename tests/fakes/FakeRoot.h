@@ -35,6 +35,8 @@ class TFakeRoot : public TInterfacedObject, public IInternalRoot, public IDesign
   bool Dormant = false;
   bool Active = false;
   bool Locked = false;
+  /// What `GetShiftState` answers: the keys and buttons a test holds down.
+  TShiftState ShiftState;
   String FileName;
   TComponent* RootComponent() const { return FRoot; }
   void Record(const String& Call) { if (FLog) FLog->Add(FName + "." + Call); }
@@ -168,6 +170,7 @@ class TFakeRoot : public TInterfacedObject, public IInternalRoot, public IDesign
   TRect GetScrollRanges(const TPoint&) override { return {}; }
   bool MethodFromAncestor(const TMethod&) override { return false; }
   bool IsSourceReadOnly() override { return false; }
+  TShiftState GetShiftState() override { return ShiftState; }
   // IOTAAlignable
   void Align(TOTAAffect) override { Record("Align"); }
   void Size(TOTASizeAffect, int) override { Record("Size"); }

@@ -25,6 +25,8 @@ class TRecordingEnvironment : public TInterfacedObject, public IDesignEnvironmen
   std::function<void(const String& Name)> OnOpenModuleByName;
   std::function<TComponent*(const String& Name)> GlobalComponents;
   bool CreateBackups = false;
+  /// What `GetShiftState` answers: the keys and buttons a test holds down.
+  TShiftState ShiftState;
 
   void ActiveRootModified() override { FLog->Add("ActiveRootModified"); }
   void ComponentRenamed(const String& CurName, const String& NewName) override {
@@ -73,6 +75,7 @@ class TRecordingEnvironment : public TInterfacedObject, public IDesignEnvironmen
   void ItemDeleted(const IPtr<IDesigner>&, TPersistent* Item) override {
     FLog->Add("ItemDeleted(" + (Item ? Item->GetNamePath() : String("nil")) + ")");
   }
+  TShiftState GetShiftState() override { return ShiftState; }
 
 private:
   TCallLog FOwnLog;

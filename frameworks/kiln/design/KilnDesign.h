@@ -214,7 +214,11 @@ protected:
   void InitRootInstance(TComponent* Instance) override;
   void InitNewRoot(TComponent* Instance, const String& ClassName) override;
   void RootInstanceReady() override;
+  /// The topmost owner.
   TComponent* RootOf(TComponent* Component) override;
+  /// A Kiln module does not offer its own root among its names: a reference property
+  /// lists the components on the form, not the form. Other modules' roots are offered.
+  bool OffersRootName() override { return false; }
   int GetControlCount(TComponent* Component) override;
   TComponent* GetControl(TComponent* Component, int Index) override;
   bool IsControl(TComponent* Component) override;

@@ -2,6 +2,9 @@
 //
 // Starts the design core with the Kiln designer package and a recording host,
 // and opens new form modules on it. A tool is armed as the host's palette does.
+// Each module's root gets a generated class of its own (named after the module,
+// "TForm1"), as the inheritance support will give it, so handlers are methods
+// of the designed class.
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -14,8 +17,11 @@
 #include "frameworks/kiln/design/KilnDesign.h"
 #include "tests/fakes/RecordingEnvironment.h"
 #include "tests/fakes/RecordingModule.h"
+#include "tests/frameworks/kiln/design/ClassFamily.h"
 
 #include <gtest/gtest.h>
+
+#include <memory>
 
 namespace formkit::fakes {
 
@@ -37,8 +43,11 @@ struct KilnDesignFixture : ::testing::Test {
   IPtr<TRecordingEnvironment> Env;
   IPtr<IComponentDesigner> Designer;
   std::vector<IPtr<IRoot>> Open;
+  /// The generated classes of the roots; the class hooks are set while it lives.
+  std::unique_ptr<TGeneratedClasses> Classes;
 
   void SetUp() override {
+    Classes = std::make_unique<TGeneratedClasses>();
     StartDesignCore();
     RegisterKilnDesignPackage();
     Env = New<TRecordingEnvironment>(&Log);
@@ -55,6 +64,7 @@ struct KilnDesignFixture : ::testing::Test {
     GetPPIForKilnDesignerForIItemFunc = nullptr;
     StopDesignCore();
     FinalizeKiln();
+    Classes.reset(); // the roots that had the classes are gone
   }
 
   /// A new form module "Name" with a recording module record.

@@ -54,7 +54,8 @@ TEST_F(KilnDesignFixture, AModuleLivesFromCreationToClose) {
   EXPECT_EQ(Designer->GetRootsCount(), 1);
   EXPECT_EQ(Root->GetRootName(), "Form1");
   TComponent* Form = Root->GetRoot();
-  EXPECT_EQ(Form->ClassName(), "TForm");
+  EXPECT_EQ(Form->ClassName(), "TForm1"); // the module's own class, on the framework's
+  EXPECT_EQ(Form->ClassType()->Parent, TForm::StaticClass());
   EXPECT_TRUE(Form->ComponentState().Contains(csDesigning));
   EXPECT_TRUE(Form->ComponentState().Contains(csDesignInstance));
   EXPECT_EQ(static_cast<TControl*>(Form)->Caption(), "Form1");
@@ -122,7 +123,8 @@ TEST_F(KilnDesignFixture, FramesAndDataModulesAreShownInAWindowOfTheirOwn) {
                                            "Frame", "", nullptr, "");
   Open.push_back(Frame);
   TKilnRoot* Kiln = KilnRoot(Frame);
-  EXPECT_EQ(Frame->GetRoot()->ClassName(), "TFrame");
+  EXPECT_EQ(Frame->GetRoot()->ClassName(), "TFrame1");
+  EXPECT_EQ(Frame->GetRoot()->ClassType()->Parent, TFrame::StaticClass());
   ASSERT_NE(Kiln->DesignWindow(), nullptr);
   EXPECT_NE(static_cast<TComponent*>(Kiln->DesignWindow()), Frame->GetRoot());
   EXPECT_EQ(static_cast<TControl*>(Frame->GetRoot())->Parent(), Kiln->DesignWindow());

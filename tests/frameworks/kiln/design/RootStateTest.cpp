@@ -1,4 +1,5 @@
 //===- tests/frameworks/kiln/design/RootStateTest.cpp - Options, locks and services of a module ===//
+#include "platform/ScopeGuard.h"
 #include "tests/fakes/Messages.h"
 #include "tests/frameworks/kiln/design/KilnDesignFixture.h"
 
@@ -55,10 +56,14 @@ TEST_F(KilnDesignFixture, ServicesThatJoinLaterAreNamedWhenMissing) {
 
   IPtr<IRoot> Root = NewForm("Form1", &Module);
   auto Designer1 = QueryAs<IDesigner>(Root);
-  // A method in the source reaches the host; the designed class needs the class support.
-  EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Designer1->CreateMethod("Button1Click", IPtr<IEventInfo>()); }),
-            "Adding a method to the designed class is not available");
+  // A method in the source reaches the host and is a method of the designed class.
+  EXPECT_EQ(Designer1->GetMethodName(Designer1->CreateMethod("Button1Click", IPtr<IEventInfo>())), "Button1Click");
   EXPECT_EQ(Module->SourceMethods, std::vector<String>{"Button1Click"});
+  // Without the generated classes the designed class cannot take it.
+  auto Hook = std::exchange(TRootHooks::CreateSubClassMethod, nullptr);
+  auto Restore = Finally([&]() noexcept { TRootHooks::CreateSubClassMethod = std::move(Hook); });
+  EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Designer1->CreateMethod("Button2Click", IPtr<IEventInfo>()); }),
+            "Adding a method to the designed class is not available");
   EXPECT_TRUE(Designer1->MethodExists("button1click"));
   EXPECT_FALSE(Designer1->CreateMethod("", IPtr<IEventInfo>()).IsAssigned());
   EXPECT_THROW(Designer1->CreateMethod("Other", static_cast<const TTypeData*>(nullptr)), EArgumentException);
