@@ -12,6 +12,8 @@
 //===----------------------------------------------------------------------===//
 #pragma once
 
+#include <benchmark/benchmark.h>
+
 #include <algorithm>
 #include <chrono>
 #include <functional>
@@ -30,6 +32,21 @@ inline double BestOf(int Reps, const std::function<void()>& Step) {
   double Best = 1e9;
   for (int I = 0; I < Reps; ++I) Best = std::min(Best, SecondsOf(Step));
   return Best;
+}
+
+/// Times `Step` at each iteration as the iteration's manual time and reports `x_base`:
+/// the mean time over `BaseSeconds`. `BetweenSteps`, if given, runs after each step,
+/// untimed.
+inline void ReportAgainstBase(benchmark::State& State, double BaseSeconds, const std::function<void()>& Step,
+                              const std::function<void()>& BetweenSteps = {}) {
+  double Total = 0;
+  for (auto _ : State) {
+    double Seconds = SecondsOf(Step);
+    State.SetIterationTime(Seconds);
+    Total += Seconds;
+    if (BetweenSteps) BetweenSteps();
+  }
+  State.counters["x_base"] = Total / static_cast<double>(State.iterations()) / BaseSeconds;
 }
 
 } // namespace formkit::bench

@@ -1,6 +1,7 @@
 //===- editors/ComponentGuidelines.cpp - Guides of components and their registry ---===//
 #include "editors/ComponentGuidelines.h"
 
+#include "editors/EditorRegistry.h"
 #include "surface/Designer.h"
 
 #include <array>
@@ -167,8 +168,7 @@ IPtr<IComponentGuidelines> GuidelinesFor(const IPtr<IDesigner>& Designer, TCompo
                                          TComponent* AContainer) {
   if (!AComponent) throw EArgumentException(sGuidelinesWithoutComponent);
   const TClass Class = RegisteredGuidelinesClass(AComponent->ClassType());
-  if (!Class || !Class->InheritsFrom(TBaseComponentGuidelines::StaticClass()))
-    throw EInvalidCast(sNotAGuidelinesClass, Class ? Class->ClassName : String("(none)"));
+  detail::RequireEditorClass(Class, TBaseComponentGuidelines::StaticClass(), "component guidelines");
   // The one reference is held from the construction on: when `Initialize` raises, the
   // instance goes with it on the way out and the exception passes on.
   IPtr<TBaseComponentGuidelines> Guidelines = NewFromClass<TBaseComponentGuidelines>(Class, Designer);

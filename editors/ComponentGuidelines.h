@@ -32,7 +32,6 @@ namespace formkit {
 inline constexpr int NoGuideOffset = INT_MAX;
 
 FK_RESOURCESTRING(sGuidelinesWithoutComponent, "Guidelines need a component");
-FK_RESOURCESTRING(sNotAGuidelinesClass, "Class %s is not a component guidelines class");
 
 /// The guides of a component that offers none; the base of the guidelines classes. Holds
 /// the component and its container without owning them; it must not outlive them.
@@ -74,7 +73,7 @@ protected:
 /// registered for its class or for its nearest ancestor below `TPersistent`, else of
 /// `TComponentGuidelines`, made with `Designer` and initialised. What `Initialize` raises
 /// passes on, the instance freed. Raises `EArgumentException` `sGuidelinesWithoutComponent`
-/// for a null component, `EInvalidCast` `sNotAGuidelinesClass` when the class found does
+/// for a null component, `EInvalidCast` "Class %s is not a component guidelines class" when the class found does
 /// not descend from `TBaseComponentGuidelines`, `EInvalidOperation` when it is abstract,
 /// and `EIntfCastError` when it does not offer `IComponentGuidelines`. Cost: one look-up
 /// for each class up the ancestry.

@@ -14,6 +14,7 @@
 //===----------------------------------------------------------------------===//
 #pragma once
 
+#include "editors/ComponentEditors.h"
 #include "editors/ComponentGuidelines.h"
 #include "editors/EditorRegistry.h"
 #include "editors/PropertyEditor.h"

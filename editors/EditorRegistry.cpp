@@ -3,6 +3,8 @@
 
 #include "core/DesignCore.h"
 #include "core/EditorGroups.h"
+#include "core/root/RootHooks.h"
+#include "editors/ComponentEditors.h"
 #include "editors/ComponentGuidelines.h"
 #include "editors/ReferenceEditors.h"
 #include "editors/ScalarEditors.h"
@@ -199,6 +201,7 @@ TPropertyEditorClass GetEditorClass(PPropInfo PropInfo, TPersistent* Obj) {
 
 TNewPropertyEditor NewPropertyEditor(TPropertyEditorClass EditorClass, const IPtr<IDesigner>& Designer,
                                      int PropCount) {
+  detail::RequireEditorClass(EditorClass, TBasePropertyEditor::StaticClass(), "property editor");
   TNewPropertyEditor Result;
   Result.Editor = NewFromClass<TBasePropertyEditor>(EditorClass, Designer, PropCount);
   Result.Prop = CastAs<IProperty>(Result.Editor.Get());
@@ -256,6 +259,11 @@ void TPropInfoList::Intersect(const TPropInfoList& List) {
 
 namespace detail {
 
+void RequireEditorClass(TClass Class, TClass Base, const char* Kind) {
+  if (!Class || !Class->InheritsFrom(Base))
+    throw EInvalidCast(sNotAnEditorClass, Class ? Class->ClassName : String("(none)"), Kind);
+}
+
 void StartEditorRegistries() {
   RegisterPropertyEditorProc = &RegisterPropertyEditorEntry;
   RegisterPropertyMapperProc = &RegisterPropertyMapperEntry;
@@ -263,6 +271,7 @@ void StartEditorRegistries() {
   RegisterSelectionEditorProc = &RegisterSelectionEditorEntry;
   SetPropertyEditorGroupProc = &SetPropertyEditorGroupEntry;
   GetComponentPropertiesProc = &EnumerateComponentProperties;
+  TRootHooks::GetComponentEditor = &GetComponentEditor;
   StartComponentGuidelines();
 }
 
@@ -273,6 +282,7 @@ void StopEditorRegistries() noexcept {
   RegisterSelectionEditorProc = nullptr;
   SetPropertyEditorGroupProc = nullptr;
   GetComponentPropertiesProc = nullptr;
+  TRootHooks::GetComponentEditor = nullptr;
   StopComponentGuidelines();
   TRegistryLists& L = Lists();
   L.PropertyClasses.clear();

@@ -157,7 +157,14 @@ struct TNewPropertyEditor {
 /// Call once before `StartDesignCore`; a repeat does nothing.
 FK_API void InitializeDesignEditors();
 
+/// The message of a registered class that is not of the kind of editor it was registered as.
+FK_RESOURCESTRING(sNotAnEditorClass, "Class %s is not a %s class");
+
 namespace detail {
+/// Raises `EInvalidCast` "Class %s is not a %s class" (naming the class, "(none)" for null,
+/// and `Kind`) unless `Class` is `Base` or descends from it: a registration is trusted
+/// with any class, and making an instance of the wrong one would corrupt memory.
+FK_API void RequireEditorClass(TClass Class, TClass Base, const char* Kind);
 /// Sets the registration hooks and the enumeration hook of the design contract.
 FK_API void StartEditorRegistries();
 /// Clears the hooks and frees every list: registrations then do nothing.

@@ -35,9 +35,11 @@ IPtr<ISelectionEditorList> GetSelectionEditors(const IPtr<IDesigner>& ADesigner,
   IPtr<TSelectionEditorList> Result = New<TSelectionEditorList>();
   if (!ASelections || ASelections->GetCount() == 0) return Result;
   TClass Common = NearestCommonAncestor(ASelections);
-  for (const auto& Def : SelectionEditorDefinitions())
-    if (Def->Matches(Common))
-      Result->Add(CastAs<ISelectionEditor>(NewFromClass<TBaseSelectionEditor>(Def->Editor(), ADesigner).Get()));
+  for (const auto& Def : SelectionEditorDefinitions()) {
+    if (!Def->Matches(Common)) continue;
+    detail::RequireEditorClass(Def->Editor(), TBaseSelectionEditor::StaticClass(), "selection editor");
+    Result->Add(CastAs<ISelectionEditor>(NewFromClass<TBaseSelectionEditor>(Def->Editor(), ADesigner).Get()));
+  }
   return Result;
 }
 

@@ -50,6 +50,26 @@ FK_IMPLEMENT(TOtherGadget, "GadgetUnit") {
   B.Field("Tint", &TOtherGadget::FTint);
 }
 
+FK_IMPLEMENT(TClicker, "GadgetUnit") {
+  B.Event("OnClick", &TClicker::FOnClick);
+  B.Event("OnChange", &TClicker::FOnChange);
+  B.Event("Online", &TClicker::FOnline);
+  B.Event("Click", &TClicker::FClick);
+  B.Method<&TClicker::Pressed>("Pressed");
+}
+FK_IMPLEMENT(TCreator, "GadgetUnit") {
+  B.Event("OnActivate", &TCreator::FOnActivate);
+  B.Event("OnCreate", &TCreator::FOnCreate);
+}
+FK_IMPLEMENT(TDropper, "GadgetUnit") {
+  B.Event("OnEnter", &TDropper::FOnEnter);
+  B.Event("OnDrop", &TDropper::FOnDrop);
+}
+FK_IMPLEMENT(TVariantGadget, "GadgetUnit") {
+  B.Field("Value", &TVariantGadget::FValue);
+  B.Field("Link", &TVariantGadget::FLink);
+}
+
 FK_IMPLEMENT(TShyGadget, "GadgetUnit") {}
 
 void TShyGadget::Create(TComponent* AOwner) {

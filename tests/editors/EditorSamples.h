@@ -74,6 +74,28 @@ class TOtherGadget : public TComponent {
   int FTint = 0;
 };
 
+/// Events named to test the default editor's preference and the proposed handler names.
+class TClicker : public TComponent {
+  FK_CLASS(TClicker, TComponent)
+  void Pressed(TObject*) {}
+  TPingEvent FOnClick, FOnChange, FOnline, FClick;
+};
+class TCreator : public TComponent {
+  FK_CLASS(TCreator, TComponent)
+  TPingEvent FOnActivate, FOnCreate;
+};
+class TDropper : public TComponent {
+  FK_CLASS(TDropper, TComponent)
+  TPingEvent FOnEnter, FOnDrop;
+};
+
+/// A variant property and an interface reference.
+class TVariantGadget : public TComponent {
+  FK_CLASS(TVariantGadget, TComponent)
+  TVariant FValue;
+  IPtr<IInterface> FLink;
+};
+
 /// A gadget whose values may not be read at design time.
 class TShyGadget : public TGadget {
   FK_CLASS(TShyGadget, TGadget)

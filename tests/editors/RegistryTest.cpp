@@ -193,6 +193,28 @@ TEST_F(RegistryTest, FreeingAGroupDropsItsComponentAndSelectionEditorsAndMappers
   EXPECT_EQ(SelectionEditorDefinitions()[0]->Group(), -1);
 }
 
+TEST_F(RegistryTest, AClassRegisteredAsAnEditorOfAnotherKindIsRefusedWhenMade) {
+  TGadget* G = Make<TGadget>("Gadget1");
+  auto Refusal = [](auto&& Make) {
+    try {
+      Make();
+    } catch (const EInvalidCast& E) {
+      return E.Message();
+    }
+    return String("made");
+  };
+  RegisterPropertyEditor(TypeInfo<int>(), TGadget::StaticClass(), "Count", TGadget::StaticClass());
+  EXPECT_EQ(Refusal([&] { (void)PropertiesOf({G}); }), "Class TGadget is not a property editor class");
+  RegisterComponentEditor(TGadget::StaticClass(), TIntegerProperty::StaticClass());
+  EXPECT_EQ(Refusal([&] { (void)GetComponentEditor(G, nullptr); }),
+            "Class TIntegerProperty is not a component editor class");
+  RegisterComponentEditor(TGadget::StaticClass(), nullptr);
+  EXPECT_EQ(Refusal([&] { (void)GetComponentEditor(G, nullptr); }), "Class (none) is not a component editor class");
+  RegisterSelectionEditor(TGadget::StaticClass(), TGadget::StaticClass());
+  EXPECT_EQ(Refusal([&] { (void)GetSelectionEditors(nullptr, G); }),
+            "Class TGadget is not a selection editor class");
+}
+
 TEST_F(RegistryTest, WithTheRegistriesStoppedRegistrationsDoNothing) {
   StopDesignCore();
   RegisterPropertyEditor(TypeInfo<int>(), nullptr, "", TOtherIntegerProperty::StaticClass());
