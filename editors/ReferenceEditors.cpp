@@ -225,6 +225,7 @@ void TMethodProperty::GetValues(const TGetStrProc& Proc) {
 
 void TMethodProperty::Edit() {
   IPtr<IDesigner> Designer = FDesigner; // the editor may go while the host shows the source
+  if (!Designer) return;                // no module: no source to bind to
   RequireAllNamed();
   String Name = GetValue();
   if (!Name.empty() && !Designer->MethodFromAncestor(GetMethodValue())) {
@@ -239,6 +240,7 @@ void TMethodProperty::Edit() {
 
 void TMethodProperty::SetValue(const String& Value) {
   IPtr<IDesigner> Designer = FDesigner;
+  if (!Designer) return; // no module: no source to bind to
   RequireAllNamed();
   String Current = GetValue();
   if (!Current.empty() && !Value.empty() && (SameText(Current, Value) || !Designer->MethodExists(Value)) &&

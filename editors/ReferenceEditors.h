@@ -102,7 +102,8 @@ private:
 
 /// Events, bound to methods of the designed class by name. Writing a new name creates
 /// the handler in the module's source; writing another case of the same name, or a
-/// name no method has, renames the bound one.
+/// name no method has, renames the bound one. Without a designer there is no source:
+/// writes and edits do nothing.
 class FK_API TMethodProperty : public TPropertyEditor, public IMethodProperty {
   FK_CLASS(TMethodProperty, TPropertyEditor)
   FK_INTERFACES(IMethodProperty)

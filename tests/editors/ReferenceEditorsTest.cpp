@@ -210,6 +210,10 @@ TEST_F(ReferenceEditorsTest, ProposedNamesForTheRootForPathsAndForTheUnnamed) {
             "Form1Change");
   // An unnamed object anywhere in the selection: no handler can be named.
   auto* Named = Make<TClicker>("Clicker1");
+  IPtr<IProperty> Detached = EditorOf({Named}, "OnClick"); // no module, no source: nothing happens
+  Detached->SetValue("Anything");
+  Detached->Edit();
+  EXPECT_FALSE(Named->FOnClick.IsAssigned());
   auto* Unnamed = CreateComponentOf<TClicker>(Owner);
   IPtr<IProperty> Both = EditorOf({Named, Unnamed}, "OnClick", Module);
   ExpectRejected([&] { Both->SetValue("Anything"); }, "Cannot create a method for an unnamed component");

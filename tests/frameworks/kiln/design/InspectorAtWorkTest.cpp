@@ -15,18 +15,20 @@ namespace {
 
 struct InspectorAtWorkTest : KilnDesignFixture {
   IPtr<IRoot> Root;
+  IPtr<TRecordingModule> Module;
   TKilnRoot* Kiln = nullptr;
   IPtr<IDesigner> Designer;
 
   void SetUp() override {
     KilnDesignFixture::SetUp();
-    Root = NewForm("Form1");
+    Root = NewForm("Form1", &Module);
     Kiln = KilnRoot(Root);
     Designer = Kiln->AsDesigner();
   }
   void TearDown() override {
     Designer = nullptr;
     Root = nullptr;
+    Module = nullptr;
     KilnDesignFixture::TearDown();
   }
   template <class T> T* Make() {
@@ -116,6 +118,23 @@ TEST_F(InspectorAtWorkTest, AReferenceListsTheLinkableComponentsOfItsClassAndIsS
   EXPECT_EQ(Label->FocusControl(), Edit);
   Focus->SetValue("");
   EXPECT_EQ(Label->FocusControl(), nullptr);
+}
+
+TEST_F(InspectorAtWorkTest, AReferenceReachesIntoALinkedModuleByItsQualifiedName) {
+  auto* Label = Make<TLabel>();
+  IPtr<IRoot> Form2 = NewForm("Form2");
+  auto* Other = static_cast<TEdit*>(KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 75, 25));
+  IPtr<IProperty> Focus = PropertyOf(Label, "FocusControl");
+  std::vector<String> Values;
+  Focus->GetValues([&](const String& S) { Values.push_back(S); });
+  EXPECT_TRUE(Values.empty()); // Form2 is not linked yet
+  Module->LinkedModules = {"Form2"};
+  Focus->GetValues([&](const String& S) { Values.push_back(S); });
+  EXPECT_EQ(Values, (std::vector<String>{"Form2", "Form2.Edit1"})); // a linked module's root is offered too
+  Focus->SetValue("Form2.Edit1");
+  EXPECT_EQ(Label->FocusControl(), Other);
+  EXPECT_EQ(Focus->GetValue(), "Form2.Edit1");
+  Focus->SetValue("");
 }
 
 } // namespace
