@@ -116,8 +116,7 @@ void BM_UniqueNameNewStem(benchmark::State& State) {
 
 void BM_RenameThroughFamily(benchmark::State& State) {
   int Descendants = static_cast<int>(State.range(0));
-  fakes::TGeneratedClasses Classes;
-  fakes::TInheritance Family(Classes, nullptr);
+  fakes::TInheritance Family(nullptr);
   TOpenModule Ancestor = NewModule("Form0", "");
   auto* Root = static_cast<TWinControl*>(Ancestor.Root->GetRoot());
   for (int I = 1; I <= 10; ++I) {

@@ -4,6 +4,7 @@
 #include "core/Designers.h"
 #include "editors/EditorRegistry.h"
 #include "frameworks/kiln/Kiln.h"
+#include "inheritance/Proxies.h"
 
 #include <sys/stat.h>
 #include <cstdio>
@@ -108,6 +109,7 @@ void InitializeKilnDesigner(const IPtr<IDesignEnvironment>& Environment) {
 void RegisterKilnDesignPackage() {
   InitializeKiln();
   InitializeDesignEditors(); // the registries the package's editors and guides go to
+  InstallClassProxyHooks();   // designed roots get generated classes
   RegisterCustomModule(TForm::StaticClass(), TKilnCustomModule::StaticClass());
   RegisterCustomModule(TFrame::StaticClass(), TKilnFrameModule::StaticClass());
   RegisterCustomModule(TDataModule::StaticClass(), TKilnDataModuleModule::StaticClass());

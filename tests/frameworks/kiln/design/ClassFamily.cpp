@@ -1,6 +1,7 @@
-//===- tests/frameworks/kiln/design/ClassFamily.cpp - Generated classes and descendants for tests ===//
+//===- tests/frameworks/kiln/design/ClassFamily.cpp - Descendant modules for tests ===//
 #include "tests/frameworks/kiln/design/ClassFamily.h"
 
+#include "inheritance/Proxies.h"
 #include "platform/Filer.h"
 #include "platform/ScopeGuard.h"
 
@@ -10,65 +11,7 @@ namespace formkit::fakes {
 
 FK_IMPLEMENT(TModuleFamily, "Tests") {}
 
-//===----------------------------------------------------------------------===//
-// Generated classes
-//===----------------------------------------------------------------------===//
-
-TGeneratedClasses::TGeneratedClasses() {
-  TRootHooks::CreateSubClass = [this](TComponent* Instance, const String& ClassName, const String& UnitName,
-                                      TClass Parent) { CreateSubClass(Instance, ClassName, UnitName, Parent); };
-  TRootHooks::RenameSubClass = [](TComponent* Instance, const String& ClassName, const String& UnitName) {
-    TClass Class = GeneratedClassOf(Instance);
-    Class->ClassName = ClassName;
-    if (!UnitName.empty()) Class->UnitName = UnitName;
-  };
-  TRootHooks::CreateSubClassMethod = [this](TComponent* Instance, const String& Name) {
-    return CreateMethod(Instance, Name);
-  };
-  TRootHooks::RenameSubClassMethod = [](TComponent* Instance, void* Token, const String& NewName) {
-    std::vector<TMethodEntry>& Table = GeneratedClassOf(Instance)->Methods;
-    auto It = std::find_if(Table.begin(), Table.end(), [&](const TMethodEntry& M) { return M.Code == Token; });
-    if (It != Table.end()) Table.erase(It);
-    Table.push_back({NewName, Token, nullptr, nullptr}); // renamed to the end; the token stays
-  };
-  TRootHooks::DestroySubClassMethod = [](TComponent* Instance, void* Token) {
-    std::vector<TMethodEntry>& Table = GeneratedClassOf(Instance)->Methods;
-    Table.erase(std::remove_if(Table.begin(), Table.end(), [&](const TMethodEntry& M) { return M.Code == Token; }),
-                Table.end());
-  };
-}
-
-TGeneratedClasses::~TGeneratedClasses() {
-  TRootHooks::CreateSubClass = nullptr;
-  TRootHooks::RenameSubClass = nullptr;
-  TRootHooks::CreateSubClassMethod = nullptr;
-  TRootHooks::RenameSubClassMethod = nullptr;
-  TRootHooks::DestroySubClassMethod = nullptr;
-}
-
-TClass TGeneratedClasses::GeneratedClassOf(TComponent* Instance) {
-  TClass Class = Instance->ClassType();
-  if (!Class->Generated) throw EComponentDesignerException("The class of " + Instance->Name() + " is not generated");
-  return Class;
-}
-
-void TGeneratedClasses::CreateSubClass(TComponent* Instance, const String& ClassName, const String& UnitName,
-                                       TClass Parent) {
-  FRecords.push_back(TClassRec::NewGeneratedClass(Parent, ClassName, UnitName));
-  Instance->SetClassType(FRecords.back().get());
-}
-
-void* TGeneratedClasses::CreateMethod(TComponent* Instance, const String& Name) {
-  if (void* Code = Instance->MethodAddress(Name)) return Code; // here or in a parent
-  std::uintptr_t Token = 1;
-  while (FTokens.count(Token)) ++Token;
-  FTokens.insert(Token);
-  void* Code = reinterpret_cast<void*>(Token);
-  GeneratedClassOf(Instance)->Methods.push_back({Name, Code, nullptr, nullptr});
-  return Code;
-}
-
-std::vector<String> TGeneratedClasses::OwnMethods(TComponent* Instance) {
+std::vector<String> OwnMethods(TComponent* Instance) {
   std::vector<String> Names;
   for (const TMethodEntry& M : Instance->ClassType()->Methods) Names.push_back(M.Name);
   return Names;
@@ -126,7 +69,7 @@ TModuleFamily* TInheritance::FamilyOf(const IPtr<IUpdateManager>& Manager) {
   return dynamic_cast<TModuleFamily*>(Manager.Get());
 }
 
-TInheritance::TInheritance(TGeneratedClasses& Classes, TCallLog* Log) : FClasses(Classes), FLog(Log) {
+TInheritance::TInheritance(TCallLog* Log) : FLog(Log) {
   TRootHooks::InheritFrom = [this](TComponentRoot& Root, const String& ClassName, TComponent* Ancestor) {
     InheritFrom(Root, ClassName, Ancestor);
   };
@@ -152,7 +95,7 @@ TInheritance::~TInheritance() {
 
 void TInheritance::InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor) {
   TComponent* Instance = Root.Root();
-  FClasses.CreateSubClass(Instance, ClassName, Root.GetModule()->GetUnitName(), Ancestor->ClassType());
+  formkit::CreateSubClass(Instance, ClassName, Root.GetModule()->GetUnitName(), Ancestor->ClassType());
   // The descendant starts as a full image of its ancestor.
   TObjectGuard<TMemoryStream> Image(new TMemoryStream);
   {

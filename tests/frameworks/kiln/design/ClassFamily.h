@@ -1,24 +1,22 @@
-//===- tests/frameworks/kiln/design/ClassFamily.h - Generated classes and descendants for tests ===//
+//===- tests/frameworks/kiln/design/ClassFamily.h - Descendant modules for tests ===//
 //
-// Stand-ins for what the inheritance support gives the root core through its
-// hooks, built on the real class records of the platform:
+// Stand-ins for what the update manager gives the root core through its
+// hooks. Designed roots get their classes from the real generated classes
+// (inheritance/Proxies.h), whose hooks the Kiln designer package sets:
 //
-// - `TGeneratedClasses`: each new root gets its own class, made at run time on
-//   the framework's (or the ancestor module's) class; handlers are method
-//   tokens of that class, the lowest free token first.
 // - `TModuleFamily`: the update manager of one module, linked to its
 //   ancestor's and its descendants' managers; it answers whether a name is
 //   taken anywhere below, and carries a rename down the family.
 // - `TInheritance`: the hooks that make a descendant module a copy of its
-//   ancestor (written in full, read into the new root) and give every module a
-//   `TModuleFamily`.
+//   ancestor (a proxy class on the ancestor's, written in full, read into the
+//   new root) and give every module a `TModuleFamily`.
 //
 // Example:
-//   TGeneratedClasses Classes;                 // roots made now get classes
-//   TInheritance Family(Classes, &Log);        // and descendants inherit
+//   TInheritance Family(&Log);                 // descendants inherit
 //   IPtr<IRoot> Form1 = NewForm("Form1");
 //   IPtr<IRoot> Form2 = NewDescendant("Form2", "Form1");
-//   ... // close every root before the two go
+//   EXPECT_EQ(OwnMethods(Form2->GetRoot()), std::vector<String>{"Button1Click"});
+//   ... // close every root before the family goes
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -26,30 +24,13 @@
 #include "core/root/ComponentRoot.h"
 #include "tests/fakes/CallLog.h"
 
-#include <set>
+#include <vector>
 
 namespace formkit::fakes {
 
-/// Generated classes for designed roots; installs the root core's class hooks while it
-/// lives. Keeps every record it made until it goes, so the roots must be gone first.
-class TGeneratedClasses {
-public:
-  TGeneratedClasses();
-  ~TGeneratedClasses();
-  TGeneratedClasses(const TGeneratedClasses&) = delete;
-  TGeneratedClasses& operator=(const TGeneratedClasses&) = delete;
-
-  /// Moves `Instance` to a new class `ClassName` of unit `UnitName` on `Parent`.
-  void CreateSubClass(TComponent* Instance, const String& ClassName, const String& UnitName, TClass Parent);
-  /// The names of the methods of the class of `Instance` itself, in table order.
-  static std::vector<String> OwnMethods(TComponent* Instance);
-
-private:
-  void* CreateMethod(TComponent* Instance, const String& Name);
-  static TClass GeneratedClassOf(TComponent* Instance);
-  std::vector<TGeneratedClass> FRecords;
-  std::set<std::uintptr_t> FTokens;
-};
+/// The names of the methods of the class of `Instance` itself (not its parents'), in
+/// table order.
+std::vector<String> OwnMethods(TComponent* Instance);
 
 /// The update manager of one module of a family. The module holds it; it does not hold
 /// the module.
@@ -77,10 +58,10 @@ private:
 };
 
 /// Installs, while it lives, the hooks by which descendants inherit and modules get a
-/// `TModuleFamily`; `Classes` gives the classes.
+/// `TModuleFamily`. The descendant's class comes from the generated classes.
 class TInheritance {
 public:
-  TInheritance(TGeneratedClasses& Classes, TCallLog* Log);
+  explicit TInheritance(TCallLog* Log);
   ~TInheritance();
   TInheritance(const TInheritance&) = delete;
   TInheritance& operator=(const TInheritance&) = delete;
@@ -89,7 +70,6 @@ public:
 
 private:
   void InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor);
-  TGeneratedClasses& FClasses;
   TCallLog* FLog;
 };
 

@@ -3,8 +3,8 @@
 // Starts the design core with the Kiln designer package and a recording host,
 // and opens new form modules on it. A tool is armed as the host's palette does.
 // Each module's root gets a generated class of its own (named after the module,
-// "TForm1"), as the inheritance support will give it, so handlers are methods
-// of the designed class.
+// "TForm1") from the generated classes the package installs, so handlers are
+// methods of the designed class, and the class goes with the root.
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -15,13 +15,12 @@
 #include "frameworks/kiln/KilnExtCtrls.h"
 #include "frameworks/kiln/KilnStdCtrls.h"
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "inheritance/Proxies.h"
 #include "tests/fakes/RecordingEnvironment.h"
 #include "tests/fakes/RecordingModule.h"
 #include "tests/frameworks/kiln/design/ClassFamily.h"
 
 #include <gtest/gtest.h>
-
-#include <memory>
 
 namespace formkit::fakes {
 
@@ -43,11 +42,8 @@ struct KilnDesignFixture : ::testing::Test {
   IPtr<TRecordingEnvironment> Env;
   IPtr<IComponentDesigner> Designer;
   std::vector<IPtr<IRoot>> Open;
-  /// The generated classes of the roots; the class hooks are set while it lives.
-  std::unique_ptr<TGeneratedClasses> Classes;
 
   void SetUp() override {
-    Classes = std::make_unique<TGeneratedClasses>();
     StartDesignCore();
     RegisterKilnDesignPackage();
     Env = New<TRecordingEnvironment>(&Log);
@@ -56,15 +52,17 @@ struct KilnDesignFixture : ::testing::Test {
     ASSERT_TRUE(Designer);
   }
   void TearDown() override {
-    for (auto& R : Open)
-      if (R->FormFileOpen()) R->Close();
+    // Last opened, first closed: a module that nests another goes before the one it nests.
+    for (auto R = Open.rbegin(); R != Open.rend(); ++R)
+      if ((*R)->FormFileOpen()) (*R)->Close();
     Open.clear();
+    EXPECT_EQ(ProxyClassCount(), 0) << "a closed module's class outlived it";
     if (Designer) Designers()->UnregisterDesigner(Designer);
     Designer = nullptr;
     GetPPIForKilnDesignerForIItemFunc = nullptr;
     StopDesignCore();
     FinalizeKiln();
-    Classes.reset(); // the roots that had the classes are gone
+    RemoveClassProxyHooks(); // what the package set, so that the next test starts bare
   }
 
   /// A new form module "Name" with a recording module record.

@@ -48,7 +48,7 @@ class TColumnSource : public TComponent {
   TNotifyEvent FOnStart;
 };
 
-std::vector<String> OwnMethods(const IPtr<IRoot>& Root) { return TGeneratedClasses::OwnMethods(Root->GetRoot()); }
+std::vector<String> OwnMethods(const IPtr<IRoot>& Root) { return fakes::OwnMethods(Root->GetRoot()); }
 
 bool HasTemporaryMethod(const IPtr<IRoot>& Root) {
   std::vector<String> Names = OwnMethods(Root);

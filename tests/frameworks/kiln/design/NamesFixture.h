@@ -66,7 +66,7 @@ struct NamesFixture : KilnDesignFixture {
   }
 
   /// Descendants copy their ancestor; every module gets its family's update manager.
-  void WithInheritance() { Inheritance = std::make_unique<TInheritance>(*Classes, &Log); }
+  void WithInheritance() { Inheritance = std::make_unique<TInheritance>(&Log); }
 
   /// A new module "Name" inheriting from the open module "AncestorName".
   IPtr<IRoot> NewDescendant(const String& Name, const String& AncestorName, IPtr<TRecordingModule>* ModuleOut = nullptr) {
