@@ -5,6 +5,7 @@
 #include "editors/EditorRegistry.h"
 #include "frameworks/kiln/Kiln.h"
 #include "inheritance/Proxies.h"
+#include "inheritance/UpdateManager.h"
 
 #include <sys/stat.h>
 #include <cstdio>
@@ -110,6 +111,7 @@ void RegisterKilnDesignPackage() {
   InitializeKiln();
   InitializeDesignEditors(); // the registries the package's editors and guides go to
   InstallClassProxyHooks();   // designed roots get generated classes
+  InstallUpdateManagerHooks(); // descendant modules follow their ancestor
   RegisterCustomModule(TForm::StaticClass(), TKilnCustomModule::StaticClass());
   RegisterCustomModule(TFrame::StaticClass(), TKilnFrameModule::StaticClass());
   RegisterCustomModule(TDataModule::StaticClass(), TKilnDataModuleModule::StaticClass());

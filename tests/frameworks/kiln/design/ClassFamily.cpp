@@ -70,6 +70,20 @@ TModuleFamily* TInheritance::FamilyOf(const IPtr<IUpdateManager>& Manager) {
 }
 
 TInheritance::TInheritance(TCallLog* Log) : FLog(Log) {
+  FSaved.InheritFrom = TRootHooks::InheritFrom;
+  FSaved.CreateUpdateManager = TRootHooks::CreateUpdateManager;
+  FSaved.UpdateManagerComponent = TRootHooks::UpdateManagerComponent;
+  FSaved.UpdateManagerNameExists = TRootHooks::UpdateManagerNameExists;
+  FSaved.UpdateManagerRenameDescendents = TRootHooks::UpdateManagerRenameDescendents;
+  FSaved.UpdateManagerModified = TRootHooks::UpdateManagerModified;
+  FSaved.UpdateManagerRemoved = TRootHooks::UpdateManagerRemoved;
+  FSaved.UpdateManagerCanRevert = TRootHooks::UpdateManagerCanRevert;
+  FSaved.UpdateManagerRevert = TRootHooks::UpdateManagerRevert;
+  // The stand-in family answers only for names and renames.
+  TRootHooks::UpdateManagerModified = nullptr;
+  TRootHooks::UpdateManagerRemoved = nullptr;
+  TRootHooks::UpdateManagerCanRevert = nullptr;
+  TRootHooks::UpdateManagerRevert = nullptr;
   TRootHooks::InheritFrom = [this](TComponentRoot& Root, const String& ClassName, TComponent* Ancestor) {
     InheritFrom(Root, ClassName, Ancestor);
   };
@@ -86,11 +100,15 @@ TInheritance::TInheritance(TCallLog* Log) : FLog(Log) {
 }
 
 TInheritance::~TInheritance() {
-  TRootHooks::InheritFrom = nullptr;
-  TRootHooks::CreateUpdateManager = nullptr;
-  TRootHooks::UpdateManagerComponent = nullptr;
-  TRootHooks::UpdateManagerNameExists = nullptr;
-  TRootHooks::UpdateManagerRenameDescendents = nullptr;
+  TRootHooks::InheritFrom = FSaved.InheritFrom;
+  TRootHooks::CreateUpdateManager = FSaved.CreateUpdateManager;
+  TRootHooks::UpdateManagerComponent = FSaved.UpdateManagerComponent;
+  TRootHooks::UpdateManagerNameExists = FSaved.UpdateManagerNameExists;
+  TRootHooks::UpdateManagerRenameDescendents = FSaved.UpdateManagerRenameDescendents;
+  TRootHooks::UpdateManagerModified = FSaved.UpdateManagerModified;
+  TRootHooks::UpdateManagerRemoved = FSaved.UpdateManagerRemoved;
+  TRootHooks::UpdateManagerCanRevert = FSaved.UpdateManagerCanRevert;
+  TRootHooks::UpdateManagerRevert = FSaved.UpdateManagerRevert;
 }
 
 void TInheritance::InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor) {

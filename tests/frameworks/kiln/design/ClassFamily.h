@@ -58,7 +58,9 @@ private:
 };
 
 /// Installs, while it lives, the hooks by which descendants inherit and modules get a
-/// `TModuleFamily`. The descendant's class comes from the generated classes.
+/// `TModuleFamily`, and gives back the hooks it found (the real update manager's, which
+/// the Kiln designer package installs) when it goes. The descendant's class comes from
+/// the generated classes.
 class TInheritance {
 public:
   explicit TInheritance(TCallLog* Log);
@@ -71,6 +73,18 @@ public:
 private:
   void InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor);
   TCallLog* FLog;
+  /// The hooks found at construction, put back at destruction.
+  struct {
+    decltype(TRootHooks::InheritFrom) InheritFrom;
+    decltype(TRootHooks::CreateUpdateManager) CreateUpdateManager;
+    decltype(TRootHooks::UpdateManagerComponent) UpdateManagerComponent;
+    decltype(TRootHooks::UpdateManagerNameExists) UpdateManagerNameExists;
+    decltype(TRootHooks::UpdateManagerRenameDescendents) UpdateManagerRenameDescendents;
+    decltype(TRootHooks::UpdateManagerModified) UpdateManagerModified;
+    decltype(TRootHooks::UpdateManagerRemoved) UpdateManagerRemoved;
+    decltype(TRootHooks::UpdateManagerCanRevert) UpdateManagerCanRevert;
+    decltype(TRootHooks::UpdateManagerRevert) UpdateManagerRevert;
+  } FSaved;
 };
 
 } // namespace formkit::fakes

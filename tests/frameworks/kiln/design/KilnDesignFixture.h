@@ -16,6 +16,7 @@
 #include "frameworks/kiln/KilnStdCtrls.h"
 #include "frameworks/kiln/design/KilnDesign.h"
 #include "inheritance/Proxies.h"
+#include "inheritance/UpdateManager.h"
 #include "tests/fakes/RecordingEnvironment.h"
 #include "tests/fakes/RecordingModule.h"
 #include "tests/frameworks/kiln/design/ClassFamily.h"
@@ -62,7 +63,8 @@ struct KilnDesignFixture : ::testing::Test {
     GetPPIForKilnDesignerForIItemFunc = nullptr;
     StopDesignCore();
     FinalizeKiln();
-    RemoveClassProxyHooks(); // what the package set, so that the next test starts bare
+    RemoveUpdateManagerHooks(); // what the package set, so that the next test starts bare
+    RemoveClassProxyHooks();
   }
 
   /// A new form module "Name" with a recording module record.
