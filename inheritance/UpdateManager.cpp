@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <optional>
+#include <unordered_map>
 
 namespace formkit {
 
@@ -24,6 +25,10 @@ struct TPairing;
 /// The pairings of one parent. `Ancestor` tells which side is being added.
 struct TPairings {
   std::vector<std::unique_ptr<TPairing>> List;
+  /// The positions in `List` of the pairings made for one side, by the folded hash of
+  /// that side's name: [0] the descendant's, [1] the ancestor's. A hint that spares a walk
+  /// of `List` for each child of a parent of many; an entry is checked before use.
+  std::unordered_multimap<std::uint64_t, std::size_t> FMadeFor[2];
   bool Ancestor = false;
   bool FHasNew = false;
   TPairing* FPairing = nullptr;
@@ -92,15 +97,21 @@ void TPairings::AddChild(TComponent* Child) {
   // What the descendant added itself has no twin and takes no part.
   if (!Ancestor && !Child->ComponentState().Contains(csAncestor)) return;
   TPairing* Match = nullptr;
-  if (Ancestor ? FPairing->FComponent != nullptr : FPairing->FAncestor != nullptr)
-    for (auto& P : List) {
+  const std::uint64_t NameHash = FoldedNameHash(Child->Name());
+  if (Ancestor ? FPairing->FComponent != nullptr : FPairing->FAncestor != nullptr) {
+    // The first pairing in list order that has only the other side, of the same name.
+    std::size_t First = List.size();
+    auto [Begin, End] = FMadeFor[Ancestor ? 0 : 1].equal_range(NameHash);
+    for (auto It = Begin; It != End; ++It) {
+      if (It->second >= First) continue;
+      TPairing* P = List[It->second].get();
       TComponent* Other = Ancestor ? (P->FAncestor ? nullptr : P->FComponent) : (P->FComponent ? nullptr : P->FAncestor);
-      if (Other && CompareText(Other->Name(), Child->Name()) == 0) {
-        Match = P.get();
-        break;
-      }
+      if (Other && CompareText(Other->Name(), Child->Name()) == 0) First = It->second;
     }
+    if (First < List.size()) Match = List[First].get();
+  }
   if (!Match) {
+    FMadeFor[Ancestor ? 1 : 0].emplace(NameHash, List.size());
     List.push_back(std::make_unique<TPairing>());
     Match = List.back().get();
     Match->FParent = this;
@@ -156,6 +167,7 @@ void TCreateRun::DeleteDeleted(TPairing& Pairing) {
   if (const auto& Notifier = FManager.Notifier()) Notifier->Deleting(AsManager(), Pairing.FComponent);
   TComponent* Gone = std::exchange(Pairing.FComponent, nullptr);
   Pairing.FChildren.List.clear();
+  for (auto& Made : Pairing.FChildren.FMadeFor) Made.clear();
   Gone->Destroy();
 }
 

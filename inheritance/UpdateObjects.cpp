@@ -69,7 +69,11 @@ std::ptrdiff_t ClassPosition(TClass Class, PPropInfo Prop) {
 TUpdateObject::TUpdateObject(TUpdateObject* Owner, TPersistent* Obj, TPersistent* Ancestor, PPropInfo PropInfo,
                              bool Compare, bool IsRoot)
     : FOwner(Owner), FObject(Obj), FAncestor(Ancestor), FPropInfo(PropInfo), FCompare(Compare) {
-  if (FOwner) FOwner->FChildList.push_back(this);
+  if (FOwner) {
+    FOwner->FChildList.push_back(this);
+    FOwner->FChildIndex.emplace(FObject, this);
+    FOwner->FChildIndex.emplace(FAncestor, this);
+  }
   auto Undo = OnFailure([this]() noexcept { // the filer goes with its guard
     DropChildren();
     Detach();
@@ -95,7 +99,13 @@ TUpdateObject::~TUpdateObject() {
 void TUpdateObject::Detach() noexcept {
   if (!FOwner) return;
   auto& Siblings = FOwner->FChildList;
-  Siblings.erase(std::remove(Siblings.begin(), Siblings.end(), this), Siblings.end());
+  // Children usually go from the last: look there first.
+  if (!Siblings.empty() && Siblings.back() == this) Siblings.pop_back();
+  else Siblings.erase(std::remove(Siblings.begin(), Siblings.end(), this), Siblings.end());
+  for (const TPersistent* Key : {static_cast<const TPersistent*>(FObject), static_cast<const TPersistent*>(FAncestor)}) {
+    auto It = FOwner->FChildIndex.find(Key);
+    if (It != FOwner->FChildIndex.end() && It->second == this) FOwner->FChildIndex.erase(It);
+  }
   FOwner = nullptr;
 }
 
@@ -339,6 +349,7 @@ TUpdateObject* TUpdateObject::FindChild(TComponent* Component) {
     return U->FObject == static_cast<TPersistent*>(Component) || U->FAncestor == static_cast<TPersistent*>(Component);
   };
   if (Is(this)) return this;
+  if (auto Hint = FChildIndex.find(Component); Hint != FChildIndex.end() && Is(Hint->second)) return Hint->second;
   for (TUpdateObject* Child : FChildList)
     if (Is(Child)) return Child;
   for (TUpdateObject* Child : FChildList)

@@ -22,6 +22,7 @@
 
 #include "platform/Classes.h"
 
+#include <unordered_map>
 #include <vector>
 
 namespace formkit {
@@ -126,6 +127,10 @@ private:
   TComponent* FAncestorOwner = nullptr;
   std::vector<PPropInfo> FPropList;
   std::vector<TUpdateObject*> FChildList;
+  /// The direct children by their descendant's and their ancestor's object, so that
+  /// pairing the children of a parent of many costs one look-up each. A hint only: an
+  /// entry is checked before use, and a miss falls back to the walk of the list.
+  std::unordered_map<const TPersistent*, TUpdateObject*> FChildIndex;
   /// Owned: the defined properties that still follow.
   TObjectGuard<TUpdateFiler> FUpdateFiler;
   bool FIsComponent = false;

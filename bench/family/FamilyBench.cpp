@@ -1,4 +1,4 @@
-//===- bench/names/NamesBench.cpp - Free names and renames across a family ===//
+//===- bench/family/FamilyBench.cpp - Names, renames and changes across a family ===//
 //
 // A Kiln module on design with 1,000 / 10,000 buttons named Button1..ButtonN.
 // `BM_UniqueName` asks the module for a free name of the stem Button, which must
@@ -11,10 +11,13 @@
 // of as many undesigned components. Each figure carries `x_base`, its time over
 // the baseline measured in the same run; the free name grows about 10x from N
 // to 10N (it tries N numbers), the new stem not at all, the rename about 10x
-// from 5 to 50 descendants.
+// from 5 to 50 descendants. `BM_AncestorChange` moves one button of an ancestor of
+// 1,000 buttons and tells its module, which carries the change to 1 / 10 / 50 open
+// descendants through the real update managers, against 50 direct writes of the same
+// property; the time over the number of descendants is what each descendant adds.
 //
 // Example:
-//   build/release/bench/names/fk_bench_names --benchmark_min_time=0.2
+//   build/release/bench/family/fk_bench_family --benchmark_min_time=0.2
 //
 //===----------------------------------------------------------------------===//
 #include "bench/BenchTiming.h"
@@ -154,6 +157,30 @@ void BM_RenameThroughFamily(benchmark::State& State) {
   if (!Last->FindComponent(Flip ? "Renamed1" : "Button1")) State.SkipWithError("the last descendant was not renamed");
 }
 
+constexpr int AncestorButtons = 1000;
+
+void BM_AncestorChange(benchmark::State& State) {
+  int Descendants = static_cast<int>(State.range(0));
+  TOpenModule Ancestor = ButtonModule(AncestorButtons);
+  std::vector<TOpenModule> Family;
+  for (int D = 1; D <= Descendants; ++D) Family.push_back(NewModule("Heir" + IntToStr(D), "Form1"));
+  auto* Moved = static_cast<TControl*>(Ancestor.Root->GetRoot()->FindComponent("Button500"));
+  // The baseline: the same property written directly, 50 times.
+  std::vector<TObjectGuard<TButton>> Plain;
+  for (int I = 0; I < 50; ++I) Plain.emplace_back(CreateComponentOf<TButton>(nullptr));
+  int Left = 100;
+  double Base = BestOf(5, [&] {
+    ++Left;
+    for (auto& B : Plain) B->SetLeft(Left);
+  });
+  Report(State, Base, [&] {
+    Moved->SetLeft(++Left);
+    Ancestor.Kiln()->Modified();
+  });
+  auto* Heir = static_cast<TControl*>(Family.back().Root->GetRoot()->FindComponent("Button500"));
+  if (!Heir || Heir->Left() != Left) State.SkipWithError("the change did not reach the last descendant");
+}
+
 void Sizes(benchmark::internal::Benchmark* B) {
   B->ArgNames({"n"});
   for (int N : {1000, 10000}) B->Args({N});
@@ -169,6 +196,7 @@ void Families(benchmark::internal::Benchmark* B) {
 BENCHMARK(BM_UniqueName)->Apply(Sizes);
 BENCHMARK(BM_UniqueNameNewStem)->Apply(Sizes);
 BENCHMARK(BM_RenameThroughFamily)->Apply(Families);
+BENCHMARK(BM_AncestorChange)->ArgNames({"descendants"})->Arg(1)->Arg(10)->Arg(50)->Unit(benchmark::kMillisecond)->UseManualTime();
 
 } // namespace
 
