@@ -390,9 +390,26 @@ void TUpdateManager::SetChildAncestor(TComponent* Child) {
   Child->GetChildren([this](TComponent* C) { SetChildAncestor(C); }, FComponent);
 }
 
+namespace {
+/// Whether `Name` is taken in the module of `Manager` or below it; inherited components
+/// count only with `CountTwins`.
+bool NameTakenBelow(const TUpdateManager& Manager, const String& Name, bool CountTwins) {
+  TComponent* Found = Manager.GetComponent() ? Manager.GetComponent()->FindComponent(Name) : nullptr;
+  if (Found && (CountTwins || !Found->ComponentState().Contains(csAncestor))) return true;
+  const std::vector<TUpdateManager*>& Children = Manager.Children();
+  return std::any_of(Children.begin(), Children.end(),
+                     [&](const TUpdateManager* C) { return NameTakenBelow(*C, Name, CountTwins); });
+}
+} // namespace
+
 bool TUpdateManager::NameExists(const String& Name) const {
   if (FComponent && FComponent->FindComponent(Name)) return true;
-  return std::any_of(FChildList.begin(), FChildList.end(), [&](TUpdateManager* C) { return C->NameExists(Name); });
+  // While this module follows its ancestor, the inherited components of its descendants
+  // have yet to follow: one that the ancestor moved to another parent is made again here
+  // under its old name while the descendants still hold the twin that will go.
+  bool CountTwins = FMode != umUpdate;
+  return std::any_of(FChildList.begin(), FChildList.end(),
+                     [&](const TUpdateManager* C) { return NameTakenBelow(*C, Name, CountTwins); });
 }
 
 void TUpdateManager::RenameComponent(const String& CurName, const String& NewName) {
