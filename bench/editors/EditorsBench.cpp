@@ -1,6 +1,6 @@
 //===- bench/editors/EditorsBench.cpp - The inspector on many selected buttons ===//
 //
-// A selection of 100 / 1,000 / 10,000 Kiln buttons on one form. Listing measures
+// A selection of 100 / 1,000 / 10,000 / 100,000 Kiln buttons on one form. Listing measures
 // `GetComponentProperties` over the whole selection against as many plain walks of
 // the buttons' property lists; writing measures one `SetValue` of "Left" through the
 // listed editor against as many direct calls of the buttons' setter. Each figure
@@ -87,7 +87,7 @@ void BM_WriteToAll(benchmark::State& State) {
 
 void Sizes(benchmark::internal::Benchmark* B) {
   B->ArgNames({"n"});
-  for (int N : {100, 1000, 10000}) B->Args({N});
+  for (int N : {100, 1000, 10000, 100000}) B->Args({N});
   B->Unit(benchmark::kMicrosecond)->UseManualTime();
 }
 

@@ -1,6 +1,6 @@
 //===- bench/family/FamilyBench.cpp - Names, renames and changes across a family ===//
 //
-// A Kiln module on design with 1,000 / 10,000 buttons named Button1..ButtonN.
+// A Kiln module on design with 1,000 / 10,000 / 100,000 buttons named Button1..ButtonN.
 // `BM_UniqueName` asks the module for a free name of the stem Button, which must
 // try every taken number, against the plain walk of `FindComponent` over the
 // same names; `BM_UniqueNameNewStem` asks 1,000 times for a stem nobody uses,
@@ -183,7 +183,7 @@ void BM_AncestorChange(benchmark::State& State) {
 
 void Sizes(benchmark::internal::Benchmark* B) {
   B->ArgNames({"n"});
-  for (int N : {1000, 10000}) B->Args({N});
+  for (int N : {1000, 10000, 100000}) B->Args({N});
   B->Unit(benchmark::kMicrosecond)->UseManualTime();
 }
 

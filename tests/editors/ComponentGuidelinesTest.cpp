@@ -30,18 +30,20 @@ class TSampleLeaf : public TSampleMiddle {
   FK_CLASS(TSampleLeaf, TSampleMiddle)
 };
 
+/// Counts the live instances of the class it is a member of in `Count`.
+struct TLiveCount {
+  int& Count;
+  explicit TLiveCount(int& C) : Count(C) { ++Count; }
+  ~TLiveCount() { --Count; }
+  TLiveCount(const TLiveCount&) = delete;
+  TLiveCount& operator=(const TLiveCount&) = delete;
+};
+
 /// Counts its live instances and keeps what it was made and initialised with.
 class TProbeGuides : public TComponentGuidelines {
   FK_CLASS(TProbeGuides, TComponentGuidelines)
   static inline int Alive = 0;
-  void Create(const IPtr<IDesigner>& ADesigner) override {
-    inherited::Create(ADesigner);
-    ++Alive;
-  }
-  void BeforeDestruction() override {
-    --Alive;
-    inherited::BeforeDestruction();
-  }
+  TLiveCount Counted{Alive};
   const IPtr<IDesigner>& Designer() const noexcept { return FDesigner; }
 };
 // Three distinct classes to tell registrations apart.
@@ -68,14 +70,7 @@ class TRefusingGuides : public TProbeGuides {
 class TMuteGuides : public TBaseComponentGuidelines {
   FK_CLASS(TMuteGuides, TBaseComponentGuidelines)
   static inline int Alive = 0;
-  void Create(const IPtr<IDesigner>& ADesigner) override {
-    inherited::Create(ADesigner);
-    ++Alive;
-  }
-  void BeforeDestruction() override {
-    --Alive;
-    inherited::BeforeDestruction();
-  }
+  TLiveCount Counted{Alive};
   void Initialize(TComponent*, TComponent*) override {}
 };
 

@@ -32,8 +32,8 @@ class TOtherRoot : public TDesignRoot {
   FK_CLASS(TOtherRoot, TDesignRoot)
 };
 
-class TPart : public TComponent {
-  FK_CLASS(TPart, TComponent)
+class TGizmo : public TComponent {
+  FK_CLASS(TGizmo, TComponent)
 };
 
 /// An owner of designed roots; records each notification with the class `Watched` has then.
@@ -49,7 +49,7 @@ class THost : public TComponent {
 
 FK_IMPLEMENT(TDesignRoot, "ProxiesTest") {}
 FK_IMPLEMENT(TOtherRoot, "ProxiesTest") {}
-FK_IMPLEMENT(TPart, "ProxiesTest") {}
+FK_IMPLEMENT(TGizmo, "ProxiesTest") {}
 FK_IMPLEMENT(THost, "ProxiesTest") {}
 
 void* Token(std::uintptr_t N) { return reinterpret_cast<void*>(N); }
@@ -136,14 +136,14 @@ TEST_F(ProxiesTest, AnInstanceThatDoesNotFitRaisesAndNothingChanges) {
   // A root of the base class cannot become a class of a descendant.
   EXPECT_EQ(MessageOf<EInvalidCast>([&] { CreateSubClass(Root, "TForm2", "Unit2", ParentProxy); }),
             "Class TForm2 does not descend from TDesignRoot");
-  EXPECT_EQ(MessageOf<EInvalidCast>([&] { CreateSubClass(Root, "TForm3", "", TPart::StaticClass()); }),
+  EXPECT_EQ(MessageOf<EInvalidCast>([&] { CreateSubClass(Root, "TForm3", "", TGizmo::StaticClass()); }),
             "Class TForm3 does not descend from TDesignRoot");
   EXPECT_EQ(Root->ClassType(), TDesignRoot::StaticClass());
   EXPECT_EQ(ProxyReferenceCount(ParentProxy), 1);
   EXPECT_EQ(ProxyClassCount(), 1);
   Parent->Destroy();
   // The first proxy failing leaves no list behind either.
-  EXPECT_THROW(CreateSubClass(Root, "TForm3", "", TPart::StaticClass()), EInvalidCast);
+  EXPECT_THROW(CreateSubClass(Root, "TForm3", "", TGizmo::StaticClass()), EInvalidCast);
   EXPECT_EQ(ProxyClassCount(), 0);
   Root->Destroy();
 }
@@ -437,13 +437,13 @@ TEST_F(ProxiesTest, MovingIntoAClassThatIsNoProxyOrDoesNotDescendDoesNothing) {
   auto* Frame1 = NewRoot("TFrame1");
   TClass Proxy = Frame1->ClassType();
   auto* Other = CreateComponentOf<TOtherRoot>(nullptr);
-  auto* Part = CreateComponentOf<TPart>(nullptr);
+  auto* Gizmo = CreateComponentOf<TGizmo>(nullptr);
   ChangeToProxyClass(Other, TDesignRoot::StaticClass()); // not a proxy
   EXPECT_EQ(Other->ClassType(), TOtherRoot::StaticClass());
   ChangeToProxyClass(Other, Proxy); // the proxy does not descend from TOtherRoot
   EXPECT_EQ(Other->ClassType(), TOtherRoot::StaticClass());
-  ChangeToProxyClass(Part, Proxy);
-  EXPECT_EQ(Part->ClassType(), TPart::StaticClass());
+  ChangeToProxyClass(Gizmo, Proxy);
+  EXPECT_EQ(Gizmo->ClassType(), TGizmo::StaticClass());
   EXPECT_EQ(ProxyReferenceCount(Proxy), 1);
   // A proxy on a descendant class cannot hold an instance of the base class.
   auto* Derived = NewRoot<TOtherRoot>("TFrame2");
@@ -452,7 +452,7 @@ TEST_F(ProxiesTest, MovingIntoAClassThatIsNoProxyOrDoesNotDescendDoesNothing) {
             "Class TFrame2 does not descend from TDesignRoot");
   EXPECT_EQ(Base->ClassType(), TDesignRoot::StaticClass());
   EXPECT_EQ(ProxyReferenceCount(Derived->ClassType()), 1);
-  for (TComponent* C : std::vector<TComponent*>{Base, Derived, Part, Other, Frame1}) C->Destroy();
+  for (TComponent* C : std::vector<TComponent*>{Base, Derived, Gizmo, Other, Frame1}) C->Destroy();
 }
 
 TEST_F(ProxiesTest, AnInstanceMovedInByOtherMeansLeavesWithoutReleasing) {
@@ -472,10 +472,10 @@ TEST_F(ProxiesTest, AnInstanceMovedInByOtherMeansLeavesWithoutReleasing) {
 
 TEST_F(ProxiesTest, ARootWithoutOwnerHearsItsNotificationsOnce) {
   auto* Root = NewRoot("TForm1");
-  auto* Part = CreateComponentOf<TPart>(Root);
-  Part->SetName("Part1");
-  Part->Destroy();
-  EXPECT_EQ(Root->Heard, (std::vector<String>{"+TForm1", "Part1-TForm1"}));
+  auto* Gizmo = CreateComponentOf<TGizmo>(Root);
+  Gizmo->SetName("Gizmo1");
+  Gizmo->Destroy();
+  EXPECT_EQ(Root->Heard, (std::vector<String>{"+TForm1", "Gizmo1-TForm1"}));
   Root->Destroy();
 }
 
@@ -484,14 +484,14 @@ TEST_F(ProxiesTest, AnOwnedRootPassesItsNotificationsToItsOwnerInItsEarlierClass
   auto* Root = NewRoot("TForm1", nullptr, Host);
   Host->Watched = Root;
   Host->Heard.clear();
-  auto* Part = CreateComponentOf<TPart>(Root);
-  Part->SetName("Part1");
-  Part->Destroy();
+  auto* Gizmo = CreateComponentOf<TGizmo>(Root);
+  Gizmo->SetName("Gizmo1");
+  Gizmo->Destroy();
   // The owner hears of the root's components while the root is in its earlier class.
-  EXPECT_EQ(Host->Heard, (std::vector<String>{"+TDesignRoot", "Part1-TDesignRoot"}));
+  EXPECT_EQ(Host->Heard, (std::vector<String>{"+TDesignRoot", "Gizmo1-TDesignRoot"}));
   // The owner passes a removal back to its components, the root among them; the root's
   // own notification follows in its proxy class.
-  EXPECT_EQ(Root->Heard, (std::vector<String>{"+TForm1", "Part1-TDesignRoot", "Part1-TForm1"}));
+  EXPECT_EQ(Root->Heard, (std::vector<String>{"+TForm1", "Gizmo1-TDesignRoot", "Gizmo1-TForm1"}));
   EXPECT_EQ(Root->ClassName(), "TForm1");
   Host->Watched = nullptr;
   Host->Destroy(); // frees the root, and with it the proxy
@@ -502,9 +502,9 @@ TEST_F(ProxiesTest, ANestedRootPassesOnlyWhatHappensInsideIt) {
   auto* Frame = NewRoot("TFrame1", nullptr, Host);
   Frame->SetInline(true);
   Host->Watched = Frame;
-  auto* Inside = CreateComponentOf<TPart>(Frame);
+  auto* Inside = CreateComponentOf<TGizmo>(Frame);
   Inside->SetName("Inside");
-  auto* Outside = CreateComponentOf<TPart>(nullptr);
+  auto* Outside = CreateComponentOf<TGizmo>(nullptr);
   Outside->SetName("Outside");
   Frame->FreeNotification(Outside);
   Host->Heard.clear();

@@ -42,19 +42,6 @@ private:
   std::uint64_t FState;
 };
 
-/// The module's form as component data in text, written against `Ancestor`.
-String Image(TComponent* Root, TComponent* Ancestor) {
-  TObjectGuard<TMemoryStream> Data(new TMemoryStream);
-  {
-    TObjectGuard<TWriter> Writer(new TWriter(Data.Get(), 4096));
-    Writer->WriteDescendent(Root, Ancestor);
-  }
-  Data->SetPosition(0);
-  TObjectGuard<TMemoryStream> Text(new TMemoryStream);
-  ObjectBinaryToText(Data.Get(), Text.Get());
-  return String(reinterpret_cast<const char*>(Text->Memory()), static_cast<size_t>(Text->Size()));
-}
-
 /// The text without its first line, which names the module's root and class.
 String Body(const String& Text) { return Text.substr(Text.find('\n') + 1); }
 
@@ -197,7 +184,7 @@ struct RandomInheritanceTest : KilnDesignFixture, ::testing::WithParamInterface<
   /// compares the two.
   void ExpectReadBackEqual(size_t Index) {
     TComponent* Ancestor = Forms[Index - 1]->GetRoot();
-    String Difference = Image(Forms[Index]->GetRoot(), Ancestor);
+    String Difference = FormImage(Forms[Index]->GetRoot(), Ancestor);
     IPtr<IRoot> Fresh = NewDescendant("Fresh" + std::to_string(Index + 1), Forms[Index - 1]->GetRootName());
     TObjectGuard<TMemoryStream> Data(new TMemoryStream);
     {
@@ -209,8 +196,8 @@ struct RandomInheritanceTest : KilnDesignFixture, ::testing::WithParamInterface<
       TObjectGuard<TReader> Reader(new TReader(Data.Get(), 4096));
       Reader->ReadRootComponent(Fresh->GetRoot());
     }
-    EXPECT_EQ(Body(Image(Fresh->GetRoot(), Ancestor)), Body(Difference));
-    EXPECT_EQ(Body(Image(Fresh->GetRoot(), nullptr)), Body(Image(Forms[Index]->GetRoot(), nullptr)));
+    EXPECT_EQ(Body(FormImage(Fresh->GetRoot(), Ancestor)), Body(Difference));
+    EXPECT_EQ(Body(FormImage(Fresh->GetRoot(), nullptr)), Body(FormImage(Forms[Index]->GetRoot(), nullptr)));
   }
 
   std::optional<TSeededRandom> Random;

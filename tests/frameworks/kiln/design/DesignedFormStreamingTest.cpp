@@ -5,21 +5,6 @@
 using namespace formkit;
 using namespace formkit::fakes;
 
-namespace {
-/// The form as component data: signature and tree, written against `Ancestor` when given.
-String Image(TComponent* Root, TComponent* Ancestor = nullptr) {
-  TObjectGuard<TMemoryStream> Data(new TMemoryStream);
-  {
-    TObjectGuard<TWriter> Writer(new TWriter(Data.Get(), 4096));
-    Writer->WriteDescendent(Root, Ancestor);
-  }
-  Data->SetPosition(0);
-  TObjectGuard<TMemoryStream> Text(new TMemoryStream);
-  ObjectBinaryToText(Data.Get(), Text.Get());
-  return String(reinterpret_cast<const char*>(Text->Memory()), static_cast<size_t>(Text->Size()));
-}
-} // namespace
-
 TEST_F(KilnDesignFixture, AFormBuiltOnTheSurfaceRoundTripsAndWritesOnlyItsEdits) {
   Env->Options.UseDesignerGuidelines = false;
   IPtr<IRoot> Root = NewForm("Form1");
@@ -32,7 +17,7 @@ TEST_F(KilnDesignFixture, AFormBuiltOnTheSurfaceRoundTripsAndWritesOnlyItsEdits)
   Arm(nullptr);
   Kiln->CreateComponentPos(NewAs<IInternalPaletteItem, TToolItem>(TTimer::StaticClass()), 300, 300);
   TComponent* Form = Root->GetRoot();
-  String Original = Image(Form);
+  String Original = FormImage(Form);
   EXPECT_NE(Original.find("object Form1: TForm1\n"), String::npos); // the module's own class
   EXPECT_NE(Original.find("object Panel1: TPanel"), String::npos);
   EXPECT_NE(Original.find("object Button1: TButton"), String::npos);
@@ -59,12 +44,12 @@ TEST_F(KilnDesignFixture, AFormBuiltOnTheSurfaceRoundTripsAndWritesOnlyItsEdits)
   // The copy is a plain form: the same file but for the class of the module's root.
   String Plain = Original;
   Plain.replace(Plain.find("TForm1"), 6, "TForm");
-  EXPECT_EQ(Image(Copy.Get()), Plain);
+  EXPECT_EQ(FormImage(Copy.Get()), Plain);
 
   // Nudged on the surface, the module differs from the copy in the button's left only.
   Kiln->Select(Form->FindComponent("Button1"), false);
   S->KeyDown(dkRight, {ssCtrl});
-  String Difference = Image(Form, Copy.Get());
+  String Difference = FormImage(Form, Copy.Get());
   EXPECT_NE(Difference.find("inherited Button1: TButton"), String::npos);
   EXPECT_NE(Difference.find("Left = "), String::npos);
   EXPECT_EQ(Difference.find("Top = "), String::npos);

@@ -38,6 +38,10 @@ private:
   TClass FClass;
 };
 
+/// A module's form as component data in text: signature and tree, written against
+/// `Ancestor` when given.
+String FormImage(TComponent* Root, TComponent* Ancestor = nullptr);
+
 struct KilnDesignFixture : ::testing::Test {
   TCallLog Log;
   IPtr<TRecordingEnvironment> Env;

@@ -1,4 +1,4 @@
-//===- tests/frameworks/kiln/design/InspectorAtWorkTest.cpp - Editors on a module at work ===//
+//===- tests/frameworks/kiln/design/EventAndReferenceEditingTest.cpp - Editors on a module at work ===//
 //
 // The inspector's editors on a Kiln form on design, with the recording host: a double
 // click on a component opens the event a user wants and the host is asked to create
@@ -13,7 +13,7 @@ using namespace formkit::fakes;
 
 namespace {
 
-struct InspectorAtWorkTest : KilnDesignFixture {
+struct EventAndReferenceEditingTest : KilnDesignFixture {
   IPtr<IRoot> Root;
   IPtr<TRecordingModule> Module;
   TKilnRoot* Kiln = nullptr;
@@ -54,7 +54,7 @@ struct InspectorAtWorkTest : KilnDesignFixture {
   }
 };
 
-TEST_F(InspectorAtWorkTest, ADoubleClickOnAButtonCreatesAndShowsItsClickHandler) {
+TEST_F(EventAndReferenceEditingTest, ADoubleClickOnAButtonCreatesAndShowsItsClickHandler) {
   auto* Button = Make<TButton>();
   ASSERT_EQ(Button->Name(), "Button1");
   Log.Clear();
@@ -74,7 +74,7 @@ TEST_F(InspectorAtWorkTest, ADoubleClickOnAButtonCreatesAndShowsItsClickHandler)
                                                    "ShowMethod(Form1Click)"}));
 }
 
-TEST_F(InspectorAtWorkTest, AnEditPrefersItsChangeEventAndEventsAreBoundByName) {
+TEST_F(EventAndReferenceEditingTest, AnEditPrefersItsChangeEventAndEventsAreBoundByName) {
   auto* Edit = Make<TEdit>();
   auto* Button = Make<TButton>();
   Designer->SelectComponent(Edit); // a double click selects what it lands on
@@ -92,7 +92,7 @@ TEST_F(InspectorAtWorkTest, AnEditPrefersItsChangeEventAndEventsAreBoundByName) 
   EXPECT_EQ(SourceRequests(), (std::vector<String>{"RenameMethod(Edit1Change,TextChanged)"}));
 }
 
-TEST_F(InspectorAtWorkTest, AReferenceListsTheLinkableComponentsOfItsClassAndIsSetByName) {
+TEST_F(EventAndReferenceEditingTest, AReferenceListsTheLinkableComponentsOfItsClassAndIsSetByName) {
   auto* Label = Make<TLabel>();
   auto* Edit = Make<TEdit>();
   Make<TButton>();
@@ -120,7 +120,7 @@ TEST_F(InspectorAtWorkTest, AReferenceListsTheLinkableComponentsOfItsClassAndIsS
   EXPECT_EQ(Label->FocusControl(), nullptr);
 }
 
-TEST_F(InspectorAtWorkTest, AReferenceReachesIntoALinkedModuleByItsQualifiedName) {
+TEST_F(EventAndReferenceEditingTest, AReferenceReachesIntoALinkedModuleByItsQualifiedName) {
   auto* Label = Make<TLabel>();
   IPtr<IRoot> Form2 = NewForm("Form2");
   auto* Other = static_cast<TEdit*>(KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 75, 25));
