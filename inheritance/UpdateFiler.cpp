@@ -48,11 +48,29 @@ void TUpdateFiler::FilterProp(const String& Name, bool HasData) {
 void TUpdateFiler::Update() {
   // Without a twin (a sub-object the ancestor does not hold) there is nothing to carry.
   if (Empty() || !FUpdateObject->Ancestor()) return;
+  // Most updates find every defined value equal; streaming them over would only cost.
+  if (!AncestorWouldWrite()) {
+    FCompare = true;
+    return;
+  }
   TObjectGuard<TMemoryStream> Stream(new TMemoryStream);
   WriteAncestorValues(Stream.Get());
   Stream->SetPosition(0);
   ReadIntoObject(Stream.Get());
   FCompare = true;
+}
+
+bool TUpdateFiler::PassesWriteGate(const String& Name, bool HasWriter) const {
+  return (HasWriter && !FCompare) || Follows(Name);
+}
+
+bool TUpdateFiler::AncestorWouldWrite() {
+  SetAncestor(FUpdateObject->Object());
+  SetRoot(FUpdateObject->AncestorOwner());
+  FState = usProbing;
+  FWouldWrite = false;
+  FUpdateObject->Ancestor()->DefineProperties(this);
+  return FWouldWrite;
 }
 
 void TUpdateFiler::WriteAncestorValues(TStream* Stream) {
@@ -100,9 +118,9 @@ void TUpdateFiler::DefineProperty(const String& Name, const TReaderProc& ReadDat
     }
     break;
   case usWriting:
-    if ((!WriteData || FCompare) && !Follows(Name)) return;
-    FWriter->DefineProperty(Name, ReadData, WriteData, HasData);
+    if (PassesWriteGate(Name, bool(WriteData))) FWriter->DefineProperty(Name, ReadData, WriteData, HasData);
     break;
+  case usProbing: FWouldWrite = FWouldWrite || (HasData && WriteData && PassesWriteGate(Name, true)); break;
   }
 }
 
@@ -119,6 +137,7 @@ void TUpdateFiler::DefineBinaryProperty(const String& Name, const TStreamProc& R
   case usWriting:
     if (Follows(Name)) FWriter->DefineBinaryProperty(Name, ReadData, WriteData, HasData);
     break;
+  case usProbing: FWouldWrite = FWouldWrite || (HasData && WriteData && Follows(Name)); break;
   }
 }
 

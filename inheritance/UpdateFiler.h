@@ -24,7 +24,7 @@ namespace formkit {
 class TUpdateObject;
 
 /// What a `DefineProperty` call means to a `TUpdateFiler` at this moment.
-enum TUpdateFilterState : std::uint8_t { usFilter, usReading, usWriting };
+enum TUpdateFilterState : std::uint8_t { usFilter, usReading, usWriting, usProbing };
 
 /// Tracks and carries over the defined properties of one descendant object that still
 /// follow its ancestor. Owned by its `TUpdateObject`; does not own the objects compared.
@@ -41,7 +41,8 @@ class FK_API TUpdateFiler : public TFiler {
   void Filter();
   /// Copies the ancestor's values of the names still in the list into the object:
   /// written from the ancestor into a memory stream, then read into the object. Does
-  /// nothing, and allocates nothing, when the list is empty.
+  /// nothing, and allocates nothing, when the list is empty or when none of the names
+  /// would be written (a first pass asks each value whether it differs).
   void Update();
   /// True when no defined property follows the ancestor any more.
   [[nodiscard]] bool Empty() const noexcept { return FPropertyList->Count() == 0; }
@@ -60,6 +61,8 @@ class FK_API TUpdateFiler : public TFiler {
 private:
   void FilterProp(const String& Name, bool HasData);
   bool Follows(const String& Name) const { return FPropertyList->IndexOf(Name) >= 0; }
+  bool PassesWriteGate(const String& Name, bool HasWriter) const;
+  [[nodiscard]] bool AncestorWouldWrite();
   void WriteAncestorValues(TStream* Stream);
   void ReadIntoObject(TStream* Stream);
   void ReadBinary(const TStreamProc& ReadData);
@@ -72,6 +75,8 @@ private:
   TUpdateFilterState FState = usFilter;
   String FPropName;
   bool FCompare = false;
+  /// Set by a probing pass when a value would be written.
+  bool FWouldWrite = false;
 };
 
 } // namespace formkit

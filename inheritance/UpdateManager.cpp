@@ -25,16 +25,27 @@ struct TPairing;
 /// The pairings of one parent. `Ancestor` tells which side is being added.
 struct TPairings {
   std::vector<std::unique_ptr<TPairing>> List;
-  /// The positions in `List` of the pairings made for one side, by the folded hash of
-  /// that side's name: [0] the descendant's, [1] the ancestor's. A hint that spares a walk
-  /// of `List` for each child of a parent of many; an entry is checked before use.
-  std::unordered_multimap<std::uint64_t, std::size_t> FMadeFor[2];
   bool Ancestor = false;
   bool FHasNew = false;
   TPairing* FPairing = nullptr;
 
   explicit TPairings(TPairing* Owner) : FPairing(Owner) {}
   void AddChild(TComponent* Child);
+  void Clear();
+
+private:
+  TPairing* FindWaitingTwin(TComponent* Child);
+  TPairing* FindWaitingTwinByName(TComponent* Child);
+  void IndexPairing(std::size_t Index);
+
+  /// Where the next twin is likeliest: just after the last one found, since both sides
+  /// usually list their children in the same order.
+  std::size_t FGuess = 0;
+  /// The positions in `List` of the pairings that had one side when indexed, by the
+  /// folded hash of that side's name. Built at the first guess that misses, so a parent
+  /// whose children come in the same order on both sides never builds it; an entry is
+  /// checked before use.
+  std::unique_ptr<std::unordered_multimap<std::uint64_t, std::size_t>> FByName;
 };
 
 /// One position of the descendant's tree paired with one of the ancestor's; either side
@@ -93,25 +104,61 @@ void TPairing::MarkNew() {
   for (TPairings* Up = FParent; Up; Up = Up->FPairing->FParent) Up->FHasNew = true;
 }
 
+namespace {
+/// The side of `P` that waits for a twin from the side being added, or null when `P`
+/// already has the added side.
+TComponent* WaitingSide(const TPairing& P, bool Ancestor) {
+  if (Ancestor) return P.FAncestor ? nullptr : P.FComponent;
+  return P.FComponent ? nullptr : P.FAncestor;
+}
+} // namespace
+
+void TPairings::Clear() {
+  List.clear();
+  FByName.reset();
+  FGuess = 0;
+}
+
+void TPairings::IndexPairing(std::size_t Index) {
+  const TPairing& P = *List[Index];
+  if (P.FComponent && P.FAncestor) return; // a pair is never a twin again
+  if (TComponent* Side = P.FComponent ? P.FComponent : P.FAncestor)
+    FByName->emplace(FoldedNameHash(Side->Name()), Index);
+}
+
+/// The first pairing in list order that has only the other side, of the same name.
+TPairing* TPairings::FindWaitingTwin(TComponent* Child) {
+  // Names are unique among the children one root owns, so a named hit is the only one.
+  if (FGuess < List.size() && !Child->Name().empty()) {
+    TComponent* Other = WaitingSide(*List[FGuess], Ancestor);
+    if (Other && CompareText(Other->Name(), Child->Name()) == 0) return List[FGuess++].get();
+  }
+  return FindWaitingTwinByName(Child);
+}
+
+TPairing* TPairings::FindWaitingTwinByName(TComponent* Child) {
+  if (!FByName) {
+    FByName = std::make_unique<std::unordered_multimap<std::uint64_t, std::size_t>>();
+    for (std::size_t I = 0; I < List.size(); ++I) IndexPairing(I);
+  }
+  std::size_t First = List.size();
+  auto [Begin, End] = FByName->equal_range(FoldedNameHash(Child->Name()));
+  for (auto It = Begin; It != End; ++It) {
+    if (It->second >= First) continue;
+    TComponent* Other = WaitingSide(*List[It->second], Ancestor);
+    if (Other && CompareText(Other->Name(), Child->Name()) == 0) First = It->second;
+  }
+  if (First == List.size()) return nullptr;
+  FGuess = First + 1;
+  return List[First].get();
+}
+
 void TPairings::AddChild(TComponent* Child) {
   // What the descendant added itself has no twin and takes no part.
   if (!Ancestor && !Child->ComponentState().Contains(csAncestor)) return;
   TPairing* Match = nullptr;
-  const std::uint64_t NameHash = FoldedNameHash(Child->Name());
-  if (Ancestor ? FPairing->FComponent != nullptr : FPairing->FAncestor != nullptr) {
-    // The first pairing in list order that has only the other side, of the same name.
-    std::size_t First = List.size();
-    auto [Begin, End] = FMadeFor[Ancestor ? 0 : 1].equal_range(NameHash);
-    for (auto It = Begin; It != End; ++It) {
-      if (It->second >= First) continue;
-      TPairing* P = List[It->second].get();
-      TComponent* Other = Ancestor ? (P->FAncestor ? nullptr : P->FComponent) : (P->FComponent ? nullptr : P->FAncestor);
-      if (Other && CompareText(Other->Name(), Child->Name()) == 0) First = It->second;
-    }
-    if (First < List.size()) Match = List[First].get();
-  }
+  if (Ancestor ? FPairing->FComponent != nullptr : FPairing->FAncestor != nullptr) Match = FindWaitingTwin(Child);
   if (!Match) {
-    FMadeFor[Ancestor ? 1 : 0].emplace(NameHash, List.size());
     List.push_back(std::make_unique<TPairing>());
     Match = List.back().get();
     Match->FParent = this;
@@ -120,6 +167,7 @@ void TPairings::AddChild(TComponent* Child) {
   }
   if (Ancestor) Match->SetAncestor(Child);
   else Match->SetComponent(Child);
+  if (FByName && Match == List.back().get()) IndexPairing(List.size() - 1);
   if (FPairing->FNew) Match->MarkNew();
 }
 
@@ -166,8 +214,7 @@ void TCreateRun::DeleteDeleted(TPairing& Pairing) {
   if (!Pairing.FComponent) return;
   if (const auto& Notifier = FManager.Notifier()) Notifier->Deleting(AsManager(), Pairing.FComponent);
   TComponent* Gone = std::exchange(Pairing.FComponent, nullptr);
-  Pairing.FChildren.List.clear();
-  for (auto& Made : Pairing.FChildren.FMadeFor) Made.clear();
+  Pairing.FChildren.Clear();
   Gone->Destroy();
 }
 
@@ -369,7 +416,7 @@ void TUpdateManager::ReleaseUpdated() noexcept {
   std::vector<TComponent*> Touched = std::exchange(FUpdateList, {});
   for (auto It = Touched.rbegin(); It != Touched.rend(); ++It) {
     try {
-      ComponentUpdated(*It);
+      (*It)->Updated();
     } catch (const std::exception& E) {
       if (!FFirstReleaseError) FFirstReleaseError = E.what();
     } catch (...) {
@@ -378,11 +425,11 @@ void TUpdateManager::ReleaseUpdated() noexcept {
   }
 }
 
-void TUpdateManager::ComponentUpdated(TComponent*) {}
 
 void TUpdateManager::Updating(TComponent* Component) {
-  if (std::find(FUpdateList.begin(), FUpdateList.end(), Component) == FUpdateList.end())
-    FUpdateList.push_back(Component);
+  if (Component->ComponentState().Contains(csUpdating)) return;
+  FUpdateList.push_back(Component);
+  Component->Updating();
 }
 
 void TUpdateManager::SetChildAncestor(TComponent* Child) {

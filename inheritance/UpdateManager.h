@@ -142,10 +142,6 @@ class FK_API TUpdateManager : public TInterfacedObject,
   TNotifyEvent FOnUpdate;
 
 protected:
-  /// Releases a component touched by the run, in reverse order of `Updating`. The
-  /// component framework keeps no per-component update state, so by default nothing
-  /// happens; a manager of a framework that does keeps it here.
-  virtual void ComponentUpdated(TComponent* Component);
 
 private:
   void BeginUpdate();
@@ -161,6 +157,7 @@ private:
   TComponent* FAncestor = nullptr;
   TUpdateManager* FParent = nullptr;
   TUpdateMode FMode = umNone;
+  /// The components brought into the updating state by this run, in that order.
   std::vector<TComponent*> FUpdateList;
   IPtr<IUpdateManagerCallback> FNotifier;
   /// The first message of a failed release in the last run.

@@ -382,6 +382,10 @@ void TComponent::ForgetFreeNotification(TComponent* Component) {
 
 void TComponent::Loaded() { FComponentState.Exclude(csLoading); }
 
+void TComponent::Updating() { FComponentState.Include(csUpdating); }
+
+void TComponent::Updated() { FComponentState.Exclude(csUpdating); }
+
 void TComponent::GetChildren(const TGetChildProc&, TComponent*) {}
 
 void TComponent::SetChildOrder(TComponent*, int) {}

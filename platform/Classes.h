@@ -247,6 +247,11 @@ class FK_API TComponent : public TPersistent, public IInterface {
   // Streaming and children --------------------------------------------------
   /// Called once the component and its siblings have been read.
   virtual void Loaded();
+  /// Enters the updating state (`csUpdating`) while something else rewrites the
+  /// component's properties; a widget may hold back its repainting until `Updated`.
+  virtual void Updating();
+  /// Leaves the updating state.
+  virtual void Updated();
   /// Calls `Proc` for each child written under this component, in stream order; `Root`
   /// is the root being written.
   virtual void GetChildren(const TGetChildProc& Proc, TComponent* Root);

@@ -249,35 +249,44 @@ TEST_F(UpdateManagerTest, AnAncestorThatCannotBeInheritedFromSaysWhy) {
   EXPECT_EQ(ManagerOf(Form2)->Parent(), ManagerOf(Form1));
 }
 
-/// A manager whose components fail to leave the updating state, one message each.
-class TFailingManager : public TUpdateManager {
-  FK_CLASS(TFailingManager, TUpdateManager)
-  TFailingManager() = default;
-  using TUpdateManager::TUpdateManager;
-  std::vector<String> Released;
-
-protected:
-  void ComponentUpdated(TComponent* Component) override {
-    Released.push_back(Component->Name());
-    throw EComponentError("cannot release " + Component->Name());
+/// A button that leaves the updating state and then complains, noting its name.
+class TStubbornButton : public TButton {
+  FK_CLASS(TStubbornButton, TButton)
+  static inline std::vector<String> Released;
+  void Updated() override {
+    inherited::Updated();
+    Released.push_back(Name());
+    throw EComponentError("cannot release " + Name());
   }
 };
-FK_IMPLEMENT(TFailingManager, "UpdateManagerTest") {}
+FK_IMPLEMENT(TStubbornButton, "UpdateManagerTest") {}
 
 TEST_F(UpdateManagerTest, ARunReleasesEveryTouchedComponentAndReportsTheFirstFailure) {
-  OpenFamily();
-  // A second manager of Form2 against Form1, without a notifier.
-  IPtr<TFailingManager> Failing =
-      New<TFailingManager>(Form2->GetRoot(), Form1->GetRoot(), nullptr, IPtr<IUpdateManagerCallback>());
+  TObjectGuard<TForm> Ancestor(CreateComponentOf<TForm>(nullptr));
+  TObjectGuard<TForm> Descendant(CreateComponentOf<TForm>(nullptr));
+  for (TForm* Form : {Ancestor.Get(), Descendant.Get()})
+    for (const char* Name : {"Button1", "Button2"}) {
+      auto* Button = CreateComponentOf<TStubbornButton>(Form);
+      Button->SetName(Name);
+      Button->SetParent(Form);
+    }
+  for (int I = 0; I < Descendant->ComponentCount(); ++I) Descendant->Components(I)->SetAncestor(true);
+  IPtr<TUpdateManager> Manager =
+      New<TUpdateManager>(Descendant.Get(), Ancestor.Get(), nullptr, IPtr<IUpdateManagerCallback>());
+  TStubbornButton::Released.clear();
+  static_cast<TButton*>(Ancestor->FindComponent("Button1"))->SetCaption("Go");
   try {
-    Failing->Update();
+    Manager->Update();
     FAIL();
   } catch (const Exception& E) {
     // Released from the last touched to the first; the first failure is the message.
     EXPECT_EQ(E.Message(), "cannot release Button1");
   }
-  EXPECT_EQ(Failing->Released, (std::vector<String>{"Button1", "Form2"}));
-  EXPECT_EQ(Failing->Mode(), umNone);
+  EXPECT_EQ(TStubbornButton::Released, (std::vector<String>{"Button1", "Button2"}));
+  EXPECT_EQ(static_cast<TButton*>(Descendant->FindComponent("Button1"))->Caption(), "Go");
+  for (TComponent* C : {static_cast<TComponent*>(Descendant.Get()), Descendant->FindComponent("Button2")})
+    EXPECT_FALSE(C->ComponentState().Contains(csUpdating)) << C->Name();
+  EXPECT_EQ(Manager->Mode(), umNone);
 }
 
 /// Tries to run its manager again from inside a run, and stops the run when asked.
