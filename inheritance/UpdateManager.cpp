@@ -513,6 +513,7 @@ void ValidateInheritence(TComponentRoot& Root, TComponent* Ancestor) {
 }
 
 void InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor) {
+  ValidateInheritence(Root, Ancestor);
   TComponent* Instance = Root.Root();
   CreateSubClass(Instance, ClassName, Root.GetModule() ? Root.GetModule()->GetUnitName() : String(),
                  Ancestor->ClassType());

@@ -169,7 +169,8 @@ private:
 FK_API void ValidateInheritence(TComponentRoot& Root, TComponent* Ancestor);
 
 /// Makes the root of `Root` a copy of `Ancestor` in a generated class `ClassName` on the
-/// ancestor's class: every component it gets from there is marked inherited.
+/// ancestor's class: every component it gets from there is marked inherited. Checks
+/// `ValidateInheritence` first, so a refused ancestor leaves the root as it was.
 FK_API void InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor);
 
 /// The callback of a module on design for its managers: updates keep renames open and

@@ -12,7 +12,8 @@ std::vector<TClass> KilnClasses() {
           TCustomControl::StaticClass(), TCustomForm::StaticClass(), TForm::StaticClass(),
           TCustomFrame::StaticClass(), TFrame::StaticClass(),      TDataModule::StaticClass(),
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
-          TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass()};
+          TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass(),
+          TStatusBar::StaticClass()};
 }
 } // namespace
 

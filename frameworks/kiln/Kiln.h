@@ -14,6 +14,7 @@
 #pragma once
 
 #include "frameworks/kiln/KilnClipbrd.h"
+#include "frameworks/kiln/KilnComCtrls.h"
 #include "frameworks/kiln/KilnExtCtrls.h"
 #include "frameworks/kiln/KilnForms.h"
 #include "frameworks/kiln/KilnStdCtrls.h"

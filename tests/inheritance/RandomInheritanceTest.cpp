@@ -54,13 +54,6 @@ String ValueOf(TObject* Instance, const char* Name) {
 }
 
 struct RandomInheritanceTest : KilnDesignFixture, ::testing::WithParamInterface<int> {
-  IPtr<IRoot> NewDescendant(const String& Name, const String& AncestorName) {
-    IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
-    IPtr<IRoot> Root = Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
-                                            AncestorName, "", nullptr, "");
-    Open.push_back(Root);
-    return Root;
-  }
   /// The buttons and panels of a module, in the order of its components.
   static std::vector<TControl*> Controls(const IPtr<IRoot>& Form, bool OwnOnly) {
     std::vector<TControl*> Result;

@@ -20,14 +20,6 @@ namespace formkit::fakes {
 namespace {
 
 struct UpdateManagerTest : KilnDesignFixture {
-  /// A new module "Name" inheriting from the open module "AncestorName".
-  IPtr<IRoot> NewDescendant(const String& Name, const String& AncestorName) {
-    IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
-    IPtr<IRoot> Root = Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
-                                            AncestorName, "", nullptr, "");
-    Open.push_back(Root);
-    return Root;
-  }
   template <class T> T* Add(const IPtr<IRoot>& Root, TComponent* Parent = nullptr) {
     return static_cast<T*>(
         KilnRoot(Root)->CreateComponent(T::StaticClass(), Parent ? Parent : Root->GetRoot(), 8, 8, 75, 25));
@@ -237,6 +229,17 @@ TEST_F(UpdateManagerTest, AnAncestorThatCannotBeInheritedFromSaysWhy) {
   TButton* Second = Add<TButton>(Form1);
   Second->SetComponentStyle(Second->ComponentStyle() - TComponentStyle{csInheritable});
   Refused("Cannot inherit from 'Form1'.  Contains components 'Button1,Button2' that do not support inheritance");
+  // Opening a descendant is refused the same way, and no module is left half made.
+  int Roots = Designer->GetRootsCount();
+  try {
+    NewDescendant("Form2", "Form1");
+    FAIL() << "a descendant was made";
+  } catch (const EComponentDesignerException& E) {
+    EXPECT_EQ(E.Message(),
+              "Cannot inherit from 'Form1'.  Contains components 'Button1,Button2' that do not support inheritance");
+  }
+  EXPECT_EQ(Designer->GetRootsCount(), Roots);
+  EXPECT_EQ(ManagerOf(Form1)->Children().size(), 0u);
 
   Lone->Destroy();
   Second->Destroy();

@@ -290,6 +290,51 @@ TEST_F(KilnStreaming, ChildOrderComesBack) {
   EXPECT_EQ(Panel->Controls(0)->Name(), "Button1");
 }
 
+TEST_F(KilnStreaming, AStatusBarsPanelsAreItemsOfOneProperty) {
+  TRootGuard<TMainForm> Form(CreateComponentOf<TMainForm>(nullptr));
+  Form->SetName("Form1");
+  Form->SetClientWidth(300);
+  auto* Bar = Make<TStatusBar>(Form.P, Form.P, "StatusBar1");
+  EXPECT_EQ(Bar->Align(), alBottom);
+  EXPECT_EQ(Bar->Height(), 19);
+  Bar->Panels()->Add()->SetText("Ready");
+  TStatusPanel* Second = Bar->Panels()->Add();
+  Second->SetWidth(80);
+  EXPECT_EQ(Second->GetDisplayName(), "TStatusPanel");
+  try {
+    Second->SetWidth(-1);
+    FAIL();
+  } catch (const EInvalidOperation& E) {
+    EXPECT_EQ(E.Message(), "Panel width -1 is not valid: it must be 0 or more");
+  }
+  EXPECT_EQ(Second->Width(), 80);
+  std::vector<std::uint8_t> Bytes = WriteBytes(Form.P);
+  String Text = ToText(Bytes);
+  EXPECT_NE(Text.find("  object StatusBar1: TStatusBar\n"), String::npos) << Text;
+  EXPECT_NE(Text.find("    Panels = <\n"
+                      "      item\n"
+                      "        Text = \"Ready\"\n"
+                      "      end\n"
+                      "      item\n"
+                      "        Width = 80\n"
+                      "      end\n"
+                      "    >\n"),
+            String::npos)
+      << Text;
+  TRootGuard<TMainForm> Copy(ReadInto(Bytes, CreateComponentOf<TMainForm>(nullptr)));
+  auto* CopyBar = static_cast<TStatusBar*>(Copy->FindComponent("StatusBar1"));
+  ASSERT_EQ(CopyBar->Panels()->Count(), 2);
+  EXPECT_EQ(CopyBar->Panels()->Items(0)->Text(), "Ready");
+  EXPECT_EQ(CopyBar->Panels()->Items(1)->Width(), 80);
+  // Drawn cell by cell, the last one to the end of the bar.
+  TObjectGuard<TCanvas> Canvas(new TCanvas);
+  CopyBar->Paint(Canvas.Get());
+  std::vector<String> Texts;
+  for (const String& Line : Canvas->Lines())
+    if (Line.rfind("TextRect", 0) == 0) Texts.push_back(Line);
+  EXPECT_EQ(Texts, (std::vector<String>{"TextRect(0,0,50,19,2,2,\"Ready\")", "TextRect(51,0,300,19,53,2,\"\")"}));
+}
+
 TEST_F(KilnStreaming, FramesAndDataModulesAreRoots) {
   TRootGuard<TSampleFrame> Frame(CreateComponentOf<TSampleFrame>(nullptr));
   Frame->SetName("Frame1");

@@ -73,10 +73,15 @@ struct KilnDesignFixture : ::testing::Test {
 
   /// A new form module "Name" with a recording module record.
   IPtr<IRoot> NewForm(const String& Name, IPtr<TRecordingModule>* ModuleOut = nullptr) {
+    return OpenModule(Name, "", ModuleOut);
+  }
+  /// A new module "Name" inheriting from the open module "AncestorName".
+  IPtr<IRoot> NewDescendant(const String& Name, const String& AncestorName) { return OpenModule(Name, AncestorName); }
+  IPtr<IRoot> OpenModule(const String& Name, const String& AncestorName, IPtr<TRecordingModule>* ModuleOut = nullptr) {
     IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
     if (ModuleOut) *ModuleOut = Module;
-    IPtr<IRoot> Root =
-        Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name, "", "", nullptr, "");
+    IPtr<IRoot> Root = Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
+                                            AncestorName, "", nullptr, "");
     Open.push_back(Root);
     return Root;
   }
