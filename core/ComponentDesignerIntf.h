@@ -21,7 +21,9 @@ struct IDesignerModule;
 /// A stream of the host with the age of its content (-1 when no age is known).
 struct FK_API IDatedStream : IStream {
   FK_INTERFACE(IDatedStream, IStream, "{69CD3924-F029-536A-9165-992E84486640}")
+  /// The stamp of the module as of this stream.
   virtual int GetModifyTime() = 0;
+  virtual void SetModifyTime(int Time) = 0;
 };
 
 /// Ties a root component to its ancestor and its descendants. The inheritance subsystem
@@ -345,8 +347,10 @@ struct FK_API IFile : IInterface {
   /// Whether the file still is what the module was loaded from; true when nothing says
   /// otherwise.
   virtual bool CheckFileDate() = 0;
-  /// Whether the module is open with its components alive (not dormant, not closed).
-  virtual bool FormFileOpen() = 0;
+  /// The module's stream, to read, without a copy where it can be helped: the module's
+  /// cached image is lent and comes back when the stream goes, unless the module changed
+  /// in between. A dormant module gives a copy. Null for a closed module.
+  virtual IPtr<IDatedStream> FormFileOpen() = 0;
   /// The module's file name, as given when it was made or last renamed.
   virtual String GetFileName() = 0;
   /// The modification stamp: the host's `GetTimestamp` at the last change, the file's

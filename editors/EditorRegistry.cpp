@@ -3,7 +3,7 @@
 
 #include "core/DesignCore.h"
 #include "core/EditorGroups.h"
-#include "core/root/RootHooks.h"
+#include "core/root/ComponentRoot.h"
 #include "editors/ComponentEditors.h"
 #include "editors/ComponentGuidelines.h"
 #include "editors/ReferenceEditors.h"
@@ -272,6 +272,10 @@ void StartEditorRegistries() {
   SetPropertyEditorGroupProc = &SetPropertyEditorGroupEntry;
   GetComponentPropertiesProc = &EnumerateComponentProperties;
   TRootHooks::GetComponentEditor = &GetComponentEditor;
+  TRootHooks::SelectionEditorUnits = [](TComponentRoot& Root, TComponent* Component, const TGetStrProc& Proc) {
+    IPtr<ISelectionEditorList> Editors = GetSelectionEditors(Root.AsDesigner(), Component);
+    for (int I = 0; Editors && I < Editors->GetCount(); ++I) Editors->Get(I)->RequiresUnits(Proc);
+  };
   StartComponentGuidelines();
 }
 
@@ -283,6 +287,7 @@ void StopEditorRegistries() noexcept {
   SetPropertyEditorGroupProc = nullptr;
   GetComponentPropertiesProc = nullptr;
   TRootHooks::GetComponentEditor = nullptr;
+  TRootHooks::SelectionEditorUnits = nullptr;
   StopComponentGuidelines();
   TRegistryLists& L = Lists();
   L.PropertyClasses.clear();

@@ -328,7 +328,15 @@ TUpdateManager::TUpdateManager(TComponent* Component, TComponent* Ancestor,
 }
 
 void TUpdateManager::BeforeDestruction() {
-  for (TUpdateManager* Child : FChildList) Child->FParent = nullptr;
+  // The ancestor goes with its manager: what a descendant tracked of it goes too, and the
+  // descendant stays usable on its own.
+  for (TUpdateManager* Child : FChildList) {
+    Child->FParent = nullptr;
+    if (Child->FAncestor == FComponent) {
+      Child->FComponentUpdate.reset();
+      Child->FAncestor = nullptr;
+    }
+  }
   FChildList.clear();
   if (FParent) std::erase(FParent->FChildList, this);
   FParent = nullptr;

@@ -126,9 +126,17 @@ void TGlobalFixups::Compact() {
     });
 }
 
+/// A component whose `Loaded` waits for the end of the loading bracket, and the root of
+/// the read that made it. The root is watched: when it goes, its entries go, without
+/// looking at components that may have gone before it.
+struct TLoadingEntry {
+  TComponent* Component;
+  TComponent* ReadRoot;
+};
+
 struct TFixupState {
   TGlobalFixups Fixups;
-  std::vector<std::vector<TComponent*>> Loading;
+  std::vector<std::vector<TLoadingEntry>> Loading;
   std::vector<std::pair<int, TFindGlobalComponent>> Finders;
   int NextToken = 1;
   TFixupWatcher* Watcher = nullptr; // immortal, like the state
@@ -145,18 +153,13 @@ void Watch(TComponent* C) {
   if (C && C != S.Watcher) S.Watcher->FreeNotification(C);
 }
 
-bool IsOwnedBy(TComponent* C, TComponent* Owner) {
-  for (TComponent* O = C; O; O = O->Owner())
-    if (O == Owner) return true;
-  return false;
-}
-
 FK_IMPLEMENT(TFixupWatcher, "Classes") {}
 
 void TFixupWatcher::Notification(TComponent* AComponent, TOperation Operation) {
   inherited::Notification(AComponent, Operation);
   if (Operation != opRemove) return;
-  for (auto& List : State().Loading) std::erase_if(List, [&](TComponent* C) { return IsOwnedBy(C, AComponent); });
+  for (auto& List : State().Loading)
+    std::erase_if(List, [&](const TLoadingEntry& E) { return E.Component == AComponent || E.ReadRoot == AComponent; });
 }
 
 } // namespace
@@ -190,7 +193,7 @@ bool AddGlobalLoaded(const std::vector<TComponent*>& Components) {
   TFixupState& S = State();
   if (S.Loading.empty()) return false;
   auto& List = S.Loading.back();
-  List.insert(List.end(), Components.begin(), Components.end());
+  for (TComponent* C : Components) List.push_back({C, Components.front()});
   // The root is watched so that a root freed inside the bracket leaves no entries.
   if (!Components.empty()) Watch(Components.front());
   return true;
@@ -198,7 +201,8 @@ bool AddGlobalLoaded(const std::vector<TComponent*>& Components) {
 
 void RemoveGlobalLoaded(const std::vector<TComponent*>& Components) {
   std::unordered_set<TComponent*> Gone(Components.begin(), Components.end());
-  for (auto& List : State().Loading) std::erase_if(List, [&](TComponent* C) { return Gone.count(C) != 0; });
+  for (auto& List : State().Loading)
+    std::erase_if(List, [&](const TLoadingEntry& E) { return Gone.count(E.Component) != 0; });
 }
 
 } // namespace detail
@@ -212,9 +216,9 @@ void BeginGlobalLoading() { State().Loading.emplace_back(); }
 void NotifyGlobalLoading() {
   TFixupState& S = State();
   if (S.Loading.empty()) return;
-  std::vector<TComponent*> List = std::move(S.Loading.back());
+  std::vector<TLoadingEntry> List = std::move(S.Loading.back());
   S.Loading.back().clear();
-  for (TComponent* C : List) C->Loaded();
+  for (const TLoadingEntry& E : List) E.Component->Loaded();
 }
 
 void EndGlobalLoading() {
@@ -243,8 +247,8 @@ TComponent* FindGlobalComponent(const String& Name) {
   for (std::size_t I = Finders.size(); I-- > 0;)
     if (TComponent* C = Finders[I].second(Name)) return C;
   for (std::size_t L = S.Loading.size(); L-- > 0;)
-    for (TComponent* C : S.Loading[L])
-      if (!C->Owner() && SameText(C->Name(), Name)) return C;
+    for (const TLoadingEntry& E : S.Loading[L])
+      if (!E.Component->Owner() && SameText(E.Component->Name(), Name)) return E.Component;
   return nullptr;
 }
 

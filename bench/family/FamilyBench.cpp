@@ -56,7 +56,7 @@ struct TOpenModule {
   explicit TOpenModule(IPtr<IRoot> R) : Root(std::move(R)) {}
   TOpenModule(TOpenModule&&) = default;
   ~TOpenModule() {
-    if (Root && Root->FormFileOpen()) Root->Close();
+    if (Root && Root->GetRoot()) Root->Close();
   }
   TComponentRoot* Kiln() const { return dynamic_cast<TComponentRoot*>(QueryAs<IInternalRoot>(Root)->Implementor()); }
 };

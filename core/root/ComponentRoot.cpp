@@ -16,7 +16,6 @@ FK_IMPLEMENT(TComponentRoot, "ComponentDesigner") {}
 // Hooks of later parts
 //===----------------------------------------------------------------------===//
 
-std::function<void(TComponentRoot&, TStream*, const IPtr<IRoot>&)> TRootHooks::ReadModule;
 std::function<void(TComponentRoot&, const String&, TComponent*)> TRootHooks::InheritFrom;
 std::function<IPtr<IUpdateManager>(TComponentRoot&, TComponent*, TComponent*, const IPtr<IUpdateManager>&)>
     TRootHooks::CreateUpdateManager;
@@ -34,12 +33,10 @@ std::function<void*(TComponent*, const String&)> TRootHooks::CreateSubClassMetho
 std::function<void(TComponent*, void*, const String&)> TRootHooks::RenameSubClassMethod;
 std::function<void(TComponent*, void*)> TRootHooks::DestroySubClassMethod;
 std::function<void(TComponentRoot&, TComponent*, const String&, const String&)> TRootHooks::NotifyFormEditorRenamed;
-std::function<void(TComponentRoot&, bool)> TRootHooks::DeleteSelection;
-std::function<void(TComponentRoot&)> TRootHooks::SaveModule;
 std::function<bool(TClass)> TRootHooks::IsProxyClass;
 std::function<void(TComponent*, TClass)> TRootHooks::ChangeToProxyClass;
 std::function<void(TComponentRoot&, TComponent*)> TRootHooks::ValidateInheritence;
-std::function<void(TComponentRoot&, TComponent*, TStream*)> TRootHooks::ReadObjectFromStream;
+std::function<void(TComponentRoot&, TComponent*, const TGetStrProc&)> TRootHooks::SelectionEditorUnits;
 
 void RaiseServiceNotAvailable(const char* Service) { throw EComponentDesignerException(sServiceNotAvailable, Service); }
 
@@ -72,15 +69,10 @@ void TComponentRoot::Create(const TCreateArgs& Args) {
       CreateNewModule(Args);
       FDiskAge = GetEnvironment() ? GetEnvironment()->GetTimestamp() : -1;
     } else {
-      // Reading a module joins with the reader of modules.
-      if (!TRootHooks::ReadModule) RaiseServiceNotAvailable("Reading a module");
-      TObjectGuard<TStream> Stream(Args.Stream ? nullptr : FDesigner->OpenFile(FFileSystem, FFileName, fmOpenRead | fmShareDenyNone));
-      FDiskAge = Args.Stream ? -1 : FDesigner->GetFileAge(FFileSystem, FFileName);
-      TRootHooks::ReadModule(*this, Stream.Get(), Args.AncestorRoot);
+      ReadExistingModule(Args);
     }
     Initializing = true;
     InternalInitializeDesigner(false);
-    FModifyTime = FDiskAge;
     UpdateOptions();
   } catch (...) {
     if (Initializing) {
@@ -259,6 +251,9 @@ void TComponentRoot::InternalDeinitializeDesigner(bool GoingDormant) {
     FSurfaceDesigner = nullptr;
   }
   TearDownRoot();
+  FreeUndoStream();
+  ClearDependencies();
+  ClearDependents();
   FRootEditor = nullptr;
   FRootUpdateManager = nullptr;
   if (FUpdateManagers) FUpdateManagers->Clear();
@@ -278,6 +273,10 @@ void TComponentRoot::FreeRootStream() noexcept { FreeAndNil(FRootStream); }
 void TComponentRoot::BeforeDestruction() {
   FSelections = nullptr;
   FreeRootStream();
+  FreeUndoStream();
+  FreeAndNil(FDormantStream);
+  ClearDependencies();
+  ClearDependents();
   inherited::BeforeDestruction();
 }
 
@@ -321,6 +320,7 @@ void TComponentRoot::Modified() {
   if (FSurface) FSurface->BeforeRootModified();
   if (IPtr<IDesignEnvironment> Env = GetEnvironment()) FModifyTime = Env->GetTimestamp();
   FreeRootStream();
+  ClearDependencies();
   if (!FRevertingComponent) ModifiedUpdateNotification();
   GlobalFixupReferences();
   if (FSurface) FSurface->UpdateSurface();

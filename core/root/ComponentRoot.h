@@ -16,7 +16,9 @@
 // names and their lookup across modules (RootNames.cpp), handlers bound to
 // methods (RootMethods.cpp), the renames and handlers of a paste
 // (RootPaste.cpp), the host's view of an object's events (RootCompInfo.cpp),
-// the designer interface's forwards (RootDesigner.cpp).
+// the designer interface's forwards (RootDesigner.cpp), reading a module and a
+// selection (RootReading.cpp), writing, saving and dependencies (RootWriting.cpp,
+// RootStreams.cpp), copy, paste, delete and undelete (RootClipboard.cpp).
 //
 //===----------------------------------------------------------------------===//
 #pragma once
@@ -25,6 +27,7 @@
 #include "core/root/ComponentDesignSurface.h"
 #include "core/root/RootHooks.h"
 #include "core/root/RootNames.h"
+#include "core/root/RootStreams.h"
 #include "platform/Streams.h"
 
 #include <unordered_map>
@@ -47,6 +50,24 @@ FK_RESOURCESTRING(sAncestorClassName, "Cannot rename a module to the same name a
 FK_RESOURCESTRING(sServiceNotAvailable, "%s is not available");
 FK_RESOURCESTRING(sCannotPasteForm, "Cannot paste a form or datamodule into another form or datamodule");
 FK_RESOURCESTRING(sNestedInsertedInSelf, "A nested component cannot be inserted into itself");
+
+/// What the user chose for an error while a module is read.
+enum TRootReadErrorResult : std::uint8_t {
+  rerOK,        ///< go on past this error
+  rerCancel,    ///< give up the read
+  rerIgnoreAll  ///< go on past this and every further error of this read
+};
+
+/// What the user chose for an inherited component that the ancestor no longer has.
+enum TRecoveryResult : std::uint8_t {
+  rrDelete, ///< drop the component's data
+  rrRename, ///< it is the ancestor's component of another name
+  rrCreate, ///< make it anew, as the module's own
+  rrCancel  ///< give up: the reader reports its error
+};
+
+/// The answer to a yes/no/cancel question.
+enum TQueryRedirectLinksResult : std::uint8_t { qrYes, qrNo, qrCancel };
 
 /// A palette entry that can make its component.
 struct FK_API IInternalPaletteItem : IInterface {
@@ -285,9 +306,97 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   /// The handlers met by the paste under way.
   TEvents& Events() noexcept { return FEvents; }
 
+  // Module reading ------------------------------------------------------------------------
+  /// Reads the module from `Stream` (binary or text) into a new root component, over a
+  /// copy of `AncestorRoot`'s (or of the ancestor the stream names, opened when needed).
+  /// A failure frees what was made and passes on.
+  void CreateFromStream(TStream* Stream, const IPtr<IRoot>& AncestorRoot);
+  /// `Stream` in binary form: `Stream` itself, or a new stream the caller frees. With
+  /// `AtLoad` the module remembers whether it came as text.
+  [[nodiscard]] TStream* PrepareInputStream(TStream* Stream, bool AtLoad);
+  /// Peeks at the class and the ancestor class a module stream names; the stream stays
+  /// where it stood.
+  void GetCreateInfoFrom(TStream* Stream, String& ClassName, String& AncestorClassName,
+                         const IPtr<IRoot>& AncestorRoot);
+  /// Reads component data into `Instance` (the root or a nested frame) with the module's
+  /// reader hooks and class group.
+  virtual void ReadObjectFromStream(TComponent* Instance, TStream* Stream);
+  /// Opens, through the host, the modules that `Root`'s unresolved references name.
+  void LoadDependentModules(TComponent* Root);
+  /// A selection read: the components of `Stream` (a selection stream) join the module
+  /// under `Parent`, renamed where their names are taken, and are selected. `Adjust` moves
+  /// them into `Rect`.
+  void ReadStream(TStream* Stream, TComponent* Parent, bool Adjust, const TRect& Rect);
+  /// A selection read into the master of the active module, which is selected after.
+  void SelectReadStream(TStream* Stream, TComponent* Parent, bool Adjust, const TRect& Rect);
+  /// The module came from a text form file, and is written as text.
+  bool GetTextLYT() const noexcept { return FLYTToText; }
+  /// What was read may differ from the stream: an error was passed over.
+  bool HadReadError() const noexcept { return FReadError; }
+  // The reader's hooks while the module is read.
+  void ReaderObjectError(TReader* Reader, const String& Message, bool& Handled);
+  void ReaderAncestorNotFound(TReader* Reader, const String& ComponentName, TClass ComponentClass,
+                              TComponent*& Component);
+  void ReaderFindComponentClass(TReader* Reader, const String& ClassName, TClass& ComponentClass);
+  void ReaderCreateComponent(TReader* Reader, TClass ComponentClass, TComponent*& Component);
+  /// The callback of a selection read for each component read: checks and selects it.
+  void ComponentRead(TComponent* Component);
+  void ComponentReadAdjust(TComponent* Component);
+
+  // Module writing and dependencies -------------------------------------------------------
+  /// The module's image, at position 0; cached until the next change. Not the caller's.
+  TStream* GetRootStream();
+  /// Writes the module into `Stream`: as the difference against its ancestor, in text
+  /// when it came as text. Raises when the module links to modules that are not open.
+  void WriteRootStream(TStream* Stream);
+  /// The writer's hook: a nested frame is written against the module it copies.
+  void WriterFindAncestor(TWriter* Writer, TComponent* Component, const String& Name, TComponent*& Ancestor,
+                          TComponent*& RootAncestor);
+  /// Writes `Component` with the module's writer hook (the update manager's callback).
+  void WriteComponent(TWriter* Writer, TComponent* Component);
+  /// Works out the modules this one links to, once per change.
+  void UpdateDependencies() override;
+  void GetDependencies(const std::function<void(const IPtr<IRoot>&)>& Proc);
+  void GetDependentRoots(const std::function<void(const IPtr<IRoot>&)>& Proc);
+  void ClearDependencies();
+  void ClearDependents();
+  void ClearDependenciesOn(TComponent* Component);
+  void RemoveDependentLinks();
+  /// The module on design of `Component`'s root, or of the module named `Name`; null.
+  TComponentRoot* GetComponentRootFor(TComponent* Component);
+  TComponentRoot* GetComponentRootFor(const String& Name);
+  /// Calls `Proc` with the unit of each class the module's components need.
+  void GetUnits(const TGetStrProc& Proc);
+  /// The module's image goes to a `TRootStream`: the module forgets it.
+  void LendRootStream() noexcept { FRootStream = nullptr; }
+  /// A lent image comes back: kept when the module is as it was at `ModifyTime` and has
+  /// no newer image; false when the lender must free it.
+  [[nodiscard]] bool TakeBackRootStream(TMemoryStream* Image, int ModifyTime) noexcept;
+
+  // Clipboard and deletion ----------------------------------------------------------------
+  /// Writes the selection as a selection stream: a bounding rectangle when `WithRect`,
+  /// the components, and with `WithMethods` the source of their handlers.
+  void StreamSelection(TStream* Stream, bool WithMethods, TStrings* Units, bool WithRect);
+  bool CanUndelete() const noexcept { return FUndoStream != nullptr; }
+  /// Puts the last deleted selection back where it stood.
+  void DoUndelete();
+  /// The components that can be selected: the module's, then those of its nested frames.
+  void EnsureSelectableComponents();
+  int GetSelectableComponentCount();
+  TComponent* GetSelectableComponents(int Index);
+  /// Puts a component stream on the clipboard, with its text.
+  void CopyStreamToClipboard(TStream* Stream);
+  /// A new stream of the components on the clipboard (component data or text); the
+  /// caller frees it.
+  [[nodiscard]] TMemoryStream* GetClipboardStream();
+  /// Whether `Text` starts, after blanks, with "object" or "inline" in any case.
+  [[nodiscard]] static bool PossibleStream(std::string_view Text);
+  bool IsFrame(TPersistent* Instance) const;
+
   // IFile, IRoot, IInternalRoot: plain reads and forwards ---------------------------------
-  bool CheckFileDate() override { return true; }
-  bool FormFileOpen() override { return static_cast<bool>(FRoot); }
+  /// True when the file changed on disk since it was loaded or saved; takes its new age.
+  bool CheckFileDate() override;
+  IPtr<IDatedStream> FormFileOpen() override;
   String GetFileName() override { return FFileName; }
   int GetModifyTime() override { return FModifyTime; }
   int GetTimeAtLoad() override { return FDiskAge; }
@@ -316,11 +425,10 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   IPtr<ICustomModule> GetCustomModule() override { return FCustomModule; }
   IPtr<IUpdateManager> GetUpdateManager() override { return FRootUpdateManager; }
   TObject* Implementor() override { return this; }
-  bool IsDormant() override { return false; }
+  bool IsDormant() override { return FDormantStream != nullptr; }
   void PasteSelectionFromStream(TStream* Stream, TComponent* Parent, const TRect& Rect) override;
   void RemoveDependenciesOn(TComponent* Component) override;
   void Resurrect() override {}
-  void UpdateDependencies() override {}
   void SetActiveView(const IPtr<IRoot>&) override {}
   IPtr<IRoot> GetAncestorRoot() override { return IPtr<IRoot>(FAncestorRoot); }
   void CancelModes() override;
@@ -404,6 +512,33 @@ protected:
   virtual TComponent* GetParent(TComponent* Component) = 0;
   /// A component joined the module by streaming a nested frame.
   virtual void FrameComponentAdded(TComponent* Component) = 0;
+  /// Asks the user about an error while the module is read; `Message` is the reader's.
+  virtual TRootReadErrorResult AskReadError(const String& Message) = 0;
+  /// Asks the user what an inherited component of the stream, `NewName`, is now that
+  /// the ancestor `AncestorName` of `RootName` lacks it; `Candidates` (comma text) are
+  /// the inherited components it could be. May change `NewName`.
+  virtual TRecoveryResult AskAncestorRecovery(const String& RootName, const String& AncestorName, String& NewName,
+                                              const String& Candidates, bool Nested) = 0;
+  /// Asks whether the links of module `RootName` to the missing module `LinkedName` are
+  /// to be removed or redirected.
+  virtual TQueryRedirectLinksResult AskRedirectLinks(const String& RootName, const String& LinkedName) = 0;
+  /// Removes or redirects the links of `Root` to module `LinkedName`.
+  virtual void RedirectLinks(TComponent* Root, const String& LinkedName) = 0;
+  /// The clipboard of the platform the framework runs on.
+  virtual TDesignClipboard& Clipboard() = 0;
+  /// Whether the generated class of another module may stand nested in this one.
+  virtual bool CanNestClass(TClass Class) = 0;
+  /// The class group activated around every read: the framework's.
+  virtual TClass GetClassGroup() = 0;
+  /// Before the reader runs on `Instance` in `ReadObjectFromStream`.
+  virtual void BeforeReadRoot(TComponent*) {}
+  /// Around the read of a selection.
+  virtual void BeforeReadSelection() {}
+  virtual void AfterReadSelection() {}
+  /// Moves a pasted component: from `Bounds`, the rectangle the selection had, into `Rect`.
+  virtual void AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) = 0;
+  /// After the construction of a root instance failed or its read failed.
+  virtual void RootCreationFailed() {}
 
   // State -------------------------------------------------------------------------------
   IPtr<IInternalComponentDesigner> FDesigner;
@@ -426,6 +561,24 @@ protected:
   IPtr<TSelections> FSelections;
   IPtr<IInterfaceList> FMarkedItems;
   TMemoryStream* FRootStream = nullptr;
+  /// The module's stream while it is dormant; owned.
+  TMemoryStream* FDormantStream = nullptr;
+  /// The last deleted selection and the parent it stood under; owned.
+  TMemoryStream* FUndoStream = nullptr;
+  TComponent* FUndoParent = nullptr;
+  /// Receives the units a written selection needs, while `StreamSelection` runs.
+  TStrings* FUnitDependencies = nullptr;
+  /// The modules this one links to (with repeats), kept until the next change.
+  std::vector<TComponentRoot*> FDependencies;
+  std::vector<TComponent*> FSelectableComponents;
+  TRect FAdjustmentRect{};
+  TRect FAdjustmentBounds{};
+  std::int64_t FReadStreamSize = 0;
+  int FOrigLYTFormat = 0;
+  bool FLYTToText = false;
+  bool FDependenciesUpToDate = false;
+  bool FIgnoringErrors = false;
+  bool FIgnoreNext = false;
   /// The modules whose streams refer to this one: their stored streams go stale when a
   /// name here changes. Kept by the dependency tracking of module writing.
   std::vector<TComponentRoot*> FDependents;
@@ -451,6 +604,8 @@ protected:
 
 private:
   void CreateNewModule(const TCreateArgs& Args);
+  /// Reads the module from the stream given, or from its file.
+  void ReadExistingModule(const TCreateArgs& Args);
   TComponent* CreateRootAs(const String& ClassName, const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot);
   void SetCreateInfo(const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot);
   TComponent* CreateRootInstance(const String& ClassName);
@@ -469,6 +624,12 @@ private:
                   const TGetStrProc& Proc);
   /// Reads the method text of a paste after the reader's position, up to a zero byte.
   [[nodiscard]] static String ReadMethodText(TReader* Reader);
+  void CheckFixups();
+  void CollectLinks(TComponent* Instance);
+  [[nodiscard]] int WriteModuleFile(TStream* Image, int Stamp, int DiskAge);
+  void RenameModuleFile(const String& OldName, const String& NewName);
+  void ClearLinksOf(TComponent* Instance, TComponent* Gone);
+  void FreeUndoStream() noexcept;
   /// Raises "`Service` is not available" when the generated classes are not there.
   static void RequireClassMethods(const char* Service);
   static const char* const AddingMethod;

@@ -289,14 +289,13 @@ TComponent* TComponentRoot::FrameCreateComponent(TClass ComponentClass, TCompone
     FInliningComponents[Instance] = Ancestor;
     if (TRootHooks::ChangeToProxyClass) TRootHooks::ChangeToProxyClass(Instance, ComponentClass);
     FCreateFrameManagers = false;
-    if (!TRootHooks::ReadObjectFromStream) RaiseServiceNotAvailable("Reading a nested frame");
     TObjectGuard<TMemoryStream> Image(new TMemoryStream);
     {
       TObjectGuard<TWriter> Writer(new TWriter(Image.Get(), 4096));
       Writer->WriteDescendent(Ancestor, nullptr);
     } // the writer flushes as it goes
     Image->SetPosition(0);
-    TRootHooks::ReadObjectFromStream(*this, Instance, Image.Get());
+    ReadObjectFromStream(Instance, Image.Get());
     FCreateFrameManagers = SavedFrameManagers;
     FrameComponentAdded(Instance);
     for (int I = 0; I < Instance->ComponentCount(); ++I) {

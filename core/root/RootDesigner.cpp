@@ -24,11 +24,6 @@ void TComponentRoot::Activate() {
 // Components and the project
 //===----------------------------------------------------------------------===//
 
-void TComponentRoot::DeleteSelection(bool ADoAll) {
-  if (!TRootHooks::DeleteSelection) RaiseServiceNotAvailable("Deleting the selection");
-  TRootHooks::DeleteSelection(*this, ADoAll);
-}
-
 bool TComponentRoot::IsComponentHidden(TComponent* Component) {
   return Component && Component->ComponentStyle().Contains(csTransient);
 }
@@ -125,11 +120,6 @@ void TComponentRoot::ShowHelp() {}
 // Files, views, streams: joining with their own units
 //===----------------------------------------------------------------------===//
 
-void TComponentRoot::Save() {
-  if (!TRootHooks::SaveModule) RaiseServiceNotAvailable("Saving a module");
-  TRootHooks::SaveModule(*this);
-}
-
 void TComponentRoot::GoDormant() { RaiseServiceNotAvailable("Keeping a module dormant"); }
 
 IPtr<IRoot> TComponentRoot::GetView(int Index) { throw EListError(SListIndexError, Index); }
@@ -145,14 +135,6 @@ void TComponentRoot::GetViewPreview(const String&, TPersistent*) { RaiseServiceN
 void TComponentRoot::RemoveView(const String&) {}
 
 void TComponentRoot::RemoveView(int Index) { throw EListError(SListIndexError, Index); }
-
-void TComponentRoot::PasteSelectionFromStream(TStream*, TComponent*, const TRect&) {
-  RaiseServiceNotAvailable("Pasting components");
-}
-
-void TComponentRoot::CopySelectionToStream(TStream*) { RaiseServiceNotAvailable("Copying components"); }
-
-void TComponentRoot::RemoveDependenciesOn(TComponent*) {}
 
 void TComponentRoot::CancelModes() {
   if (FSurfaceDesigner) FSurfaceDesigner->CancelDragging();

@@ -1,8 +1,8 @@
 //===- core/root/RootHooks.h - Where later parts join the root core ------===//
 //
 // A module on design calls into subsystems that are built on top of it:
-// reading and writing modules, generated classes, the update manager of
-// inheritance, deletion, methods in the source, component editors. Each joins
+// generated classes, the update manager of inheritance, component and selection
+// editors. Each joins
 // by setting one hook here when its unit starts. An unset hook means that the
 // service is not there: optional services are skipped, and an operation that
 // cannot be done without its service raises `EComponentDesignerException`
@@ -23,8 +23,6 @@ namespace formkit {
 class TComponentRoot;
 
 struct FK_API TRootHooks {
-  /// Reads a module from `Stream` into the root (`CreateFromStream`); `Ancestor` may be null.
-  static std::function<void(TComponentRoot& Root, TStream* Stream, const IPtr<IRoot>& Ancestor)> ReadModule;
   /// Copies the ancestor's image into a new root instance and moves it to a generated
   /// class (the ancestor steps of `CreateRootInstance`).
   static std::function<void(TComponentRoot& Root, const String& ClassName, TComponent* Ancestor)> InheritFrom;
@@ -72,18 +70,15 @@ struct FK_API TRootHooks {
   /// when the module has one.
   static std::function<void(TComponentRoot& Root, TComponent* Component, const String& CurName, const String& NewName)>
       NotifyFormEditorRenamed;
-  /// Deletes the selection (clipboard and deletion).
-  static std::function<void(TComponentRoot& Root, bool DoAll)> DeleteSelection;
-  /// Writes the module and its dependencies (used by `Save`).
-  static std::function<void(TComponentRoot& Root)> SaveModule;
   /// Whether a class is the proxy class of a module (nested frames are made from them).
   static std::function<bool(TClass Class)> IsProxyClass;
   /// Moves an instance to a proxy class.
   static std::function<void(TComponent* Instance, TClass ProxyClass)> ChangeToProxyClass;
   /// Raises when a module cannot inherit from `Ancestor`.
   static std::function<void(TComponentRoot& Root, TComponent* Ancestor)> ValidateInheritence;
-  /// Reads component data from `Stream` into `Instance` (a root or a nested frame).
-  static std::function<void(TComponentRoot& Root, TComponent* Instance, TStream* Stream)> ReadObjectFromStream;
+  /// Calls `Proc` with the units the selection editors of `Component` ask for.
+  static std::function<void(TComponentRoot& Root, TComponent* Component, const TGetStrProc& Proc)>
+      SelectionEditorUnits;
 };
 
 /// Raises `EComponentDesignerException` "%s is not available" for the named service.

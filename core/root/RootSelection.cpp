@@ -202,10 +202,15 @@ void TComponentRoot::CanInsertComponent(TComponent*) {
 }
 
 void TComponentRoot::InstanceInserted(TPersistent* Instance) {
+  FSelectableComponents.clear();
+  // Another insertion ends the chance to undelete.
+  if (!FInUndo) FreeUndoStream();
   for (auto& Listener : DesignNotificationListeners()) Listener->ItemInserted(AsDesigner(), Instance);
 }
 
 void TComponentRoot::InstanceRemoved(TPersistent* Instance) {
+  FSelectableComponents.clear();
+  FreeRootStream();
   if (FRootUpdateManager && TRootHooks::UpdateManagerRemoved) TRootHooks::UpdateManagerRemoved(FRootUpdateManager, Instance);
   IPtr<ISelections> Items = SelectionItems();
   if (Items) {

@@ -43,7 +43,7 @@ class TFakeRoot : public TInterfacedObject, public IInternalRoot, public IDesign
 
   // IFile
   bool CheckFileDate() override { return true; }
-  bool FormFileOpen() override { return true; }
+  IPtr<IDatedStream> FormFileOpen() override { return nullptr; }
   String GetFileName() override { return FileName.empty() ? FName + ".kfm" : FileName; }
   int GetModifyTime() override { return 0; }
   int GetTimeAtLoad() override { return 0; }

@@ -53,6 +53,8 @@ class TRecordingModule : public TInterfacedObject, public IDesignerModule, publi
   /// What the host was told of the last object in a rename: "<qualified class> <name
   /// path> [<event>=<handler>,...]" (events without a handler are left out).
   String LastCompInfo;
+  /// What the source declares as the class's ancestor ("TForm1"); empty for none.
+  String AncestorClassName;
 
   void Activate(bool) override { FLog->Add("Activate"); }
   void CreateMethod(const String& Name, const IPtr<IEventInfo>&) override {
@@ -62,7 +64,7 @@ class TRecordingModule : public TInterfacedObject, public IDesignerModule, publi
   void Modified() override { FLog->Add("Modified"); }
   String GetModuleIdentifier() override { return ModuleIdentifier; }
   String GetCompUnitName() override { return UnitName; }
-  String GetAncestorClassName(const String&) override { return ""; }
+  String GetAncestorClassName(const String&) override { return AncestorClassName; }
   void GetMethods(const IPtr<IEventInfo>&, const TGetStrProc& Proc) override {
     for (const String& M : SourceMethods) Proc(M);
   }

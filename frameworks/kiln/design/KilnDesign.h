@@ -200,6 +200,22 @@ class FK_API TKilnRoot : public TComponentRoot {
 
   /// The surface, or null while none is open.
   TKilnSurface* KilnSurface() const noexcept { return FKilnSurface; }
+
+  // The user's answers while modules are read and saved ---------------------------------
+  // A host sets them: an interactive one from its dialogs, a command-line one from its
+  // options, a test from its script. Unset, every question is answered by cancelling,
+  // so nothing a user designed changes without a decision.
+  /// Answers a read error with its message.
+  static inline std::function<TRootReadErrorResult(const String& Message)> ReadErrorAnswer;
+  /// Answers for an inherited component the ancestor lacks; may change `NewName`.
+  static inline std::function<TRecoveryResult(const String& RootName, const String& AncestorName, String& NewName,
+                                              const String& Candidates, bool Nested)>
+      AncestorRecoveryAnswer;
+  /// Answers whether links to a missing module are to be removed or redirected.
+  static inline std::function<TQueryRedirectLinksResult(const String& RootName, const String& LinkedName)>
+      RedirectLinksAnswer;
+  /// The module the links go to instead; empty removes them.
+  static inline std::function<String(TComponent* Root, const String& LinkedName)> RedirectTarget;
   /// The window that shows the module.
   TCustomForm* DesignWindow() const noexcept { return FWindow; }
 
@@ -224,6 +240,18 @@ protected:
   bool IsControl(TComponent* Component) override;
   TComponent* GetParent(TComponent* Component) override;
   void FrameComponentAdded(TComponent* Component) override;
+  TRootReadErrorResult AskReadError(const String& Message) override;
+  TRecoveryResult AskAncestorRecovery(const String& RootName, const String& AncestorName, String& NewName,
+                                      const String& Candidates, bool Nested) override;
+  TQueryRedirectLinksResult AskRedirectLinks(const String& RootName, const String& LinkedName) override;
+  void RedirectLinks(TComponent* Root, const String& LinkedName) override;
+  TDesignClipboard& Clipboard() override;
+  /// Frames nest in forms and in other frames.
+  bool CanNestClass(TClass Class) override;
+  TClass GetClassGroup() override;
+  /// Moves a pasted control by what moves the selection's bounds to `Rect`'s top left;
+  /// nothing when either is empty or the control is not on the top of the paste.
+  void AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) override;
 
 private:
   void LinkDesigner(TComponent* Instance, bool Link);

@@ -96,7 +96,10 @@ void TKilnDesigner::GetBackupFileName(const String&, const String& Name, String&
 }
 
 bool TKilnDesigner::IsFileReadOnly(const String&, const String& Name) {
-  return FileExists("", Name) && ::access(Name.c_str(), W_OK) != 0;
+  // The file's own permission, not whether this process could write anyway: a file
+  // nobody may write is read-only to its owner's tools, even when they run privileged.
+  struct stat Info {};
+  return ::stat(Name.c_str(), &Info) == 0 && S_ISREG(Info.st_mode) && (Info.st_mode & (S_IWUSR | S_IWGRP | S_IWOTH)) == 0;
 }
 
 bool TKilnDesigner::DeleteFile(const String&, const String& Name) { return std::remove(Name.c_str()) == 0; }

@@ -1,6 +1,9 @@
 //===- frameworks/kiln/design/KilnRoot.cpp - A Kiln module on design -----===//
 #include "frameworks/kiln/design/KilnDesign.h"
 
+#include "frameworks/kiln/KilnClipbrd.h"
+#include "platform/Filer.h"
+
 namespace formkit {
 
 FK_IMPLEMENT(TKilnRoot, "KilnDesign") {}
@@ -118,6 +121,72 @@ void TKilnRoot::FrameComponentAdded(TComponent* Component) {
   // What a nested frame brings shows on the surface like the module's own components;
   // a non-visual one gets its icon.
   if (FKilnSurface && !dynamic_cast<TControl*>(Component)) FKilnSurface->UpdateSurface();
+}
+
+//===----------------------------------------------------------------------===//
+// Questions, the clipboard, pasted places
+//===----------------------------------------------------------------------===//
+
+TRootReadErrorResult TKilnRoot::AskReadError(const String& Message) {
+  return ReadErrorAnswer ? ReadErrorAnswer(Message) : rerCancel;
+}
+
+TRecoveryResult TKilnRoot::AskAncestorRecovery(const String& RootName, const String& AncestorName, String& NewName,
+                                               const String& Candidates, bool Nested) {
+  return AncestorRecoveryAnswer ? AncestorRecoveryAnswer(RootName, AncestorName, NewName, Candidates, Nested)
+                                : rrCancel;
+}
+
+TQueryRedirectLinksResult TKilnRoot::AskRedirectLinks(const String& RootName, const String& LinkedName) {
+  return RedirectLinksAnswer ? RedirectLinksAnswer(RootName, LinkedName) : qrCancel;
+}
+
+void TKilnRoot::RedirectLinks(TComponent* Root, const String& LinkedName) {
+  String Target = RedirectTarget ? RedirectTarget(Root, LinkedName) : String();
+  if (Target.empty()) RemoveFixupReferences(Root, LinkedName);
+  else RedirectFixupReferences(Root, LinkedName, Target);
+}
+
+namespace {
+/// The Kiln clipboard by format name.
+class TKilnDesignClipboard final : public TDesignClipboard {
+public:
+  void Open() override { formkit::Clipboard()->Open(); }
+  void Close() override { formkit::Clipboard()->Close(); }
+  bool HasFormat(const String& Name) override { return formkit::Clipboard()->HasFormat(RegisterClipboardFormat(Name)); }
+  void SetBytes(const String& Name, const std::vector<std::uint8_t>& Bytes) override {
+    formkit::Clipboard()->SetAsHandle(RegisterClipboardFormat(Name), Bytes);
+  }
+  std::vector<std::uint8_t> GetBytes(const String& Name) override {
+    return formkit::Clipboard()->GetAsHandle(RegisterClipboardFormat(Name));
+  }
+  bool HasText() override { return formkit::Clipboard()->HasFormat(CF_TEXT); }
+  void SetText(const String& Text) override { formkit::Clipboard()->SetAsText(Text); }
+  String GetText() override { return formkit::Clipboard()->AsText(); }
+};
+} // namespace
+
+TDesignClipboard& TKilnRoot::Clipboard() {
+  static TKilnDesignClipboard Board;
+  return Board;
+}
+
+bool TKilnRoot::CanNestClass(TClass Class) { return Class && Class->InheritsFrom(TCustomFrame::StaticClass()); }
+
+TClass TKilnRoot::GetClassGroup() { return TControl::StaticClass(); }
+
+void TKilnRoot::AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) {
+  auto* Control = dynamic_cast<TControl*>(Component);
+  if (Rect.IsEmpty() || Bounds.IsEmpty()) return;
+  int DX = Rect.Left - Bounds.Left, DY = Rect.Top - Bounds.Top;
+  if (Control) {
+    Control->SetBounds(Control->Left() + DX, Control->Top() + DY, Control->Width(), Control->Height());
+    return;
+  }
+  std::int32_t Info = Component->DesignInfo();
+  auto Left = static_cast<std::int16_t>(Info & 0xFFFF), Top = static_cast<std::int16_t>(Info >> 16);
+  Component->SetDesignInfo(static_cast<std::int32_t>(static_cast<std::uint16_t>(Left + DX)) |
+                           (static_cast<std::int32_t>(static_cast<std::uint16_t>(Top + DY)) << 16));
 }
 
 TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root) {

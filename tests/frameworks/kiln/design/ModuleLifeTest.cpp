@@ -152,11 +152,16 @@ TEST_F(KilnDesignFixture, TheModuleRefusesChangesTheHostForbids) {
   EXPECT_EQ(Log.Count("ToolUsed"), 1); // a failed creation disarms the tool too
   Module->ReadOnly = false;
 
-  // Services that join later say so.
+  // Deleting is refused while the source is read-only.
+  TComponent* Button = Kiln->CreateComponent(TButton::StaticClass(), Root->GetRoot(), 8, 8, 75, 25);
+  Kiln->SelectComponent(Button);
+  Module->ReadOnly = true;
   try {
     QueryAs<IDesigner>(Root)->DeleteSelection(false);
     FAIL();
   } catch (const EComponentDesignerException& E) {
-    EXPECT_EQ(E.Message(), "Deleting the selection is not available");
+    EXPECT_EQ(E.Message(), "Selection cannot be deleted.  Source is either in read only mode or is a resource form");
   }
+  EXPECT_EQ(Root->GetRoot()->FindComponent("Button1"), Button);
+  Module->ReadOnly = false;
 }

@@ -59,7 +59,6 @@ struct NamesFixture : KilnDesignFixture {
     TRootHooks::UpdateManagerRevert = nullptr;
     TRootHooks::IsProxyClass = nullptr;
     TRootHooks::ChangeToProxyClass = nullptr;
-    TRootHooks::ReadObjectFromStream = nullptr;
     KilnDesignFixture::TearDown(); // closes the modules, frees the events and the classes
     Inheritance.reset();
     Listener.Reset();
@@ -70,30 +69,15 @@ struct NamesFixture : KilnDesignFixture {
 
   /// A new module "Name" inheriting from the open module "AncestorName".
   IPtr<IRoot> NewDescendant(const String& Name, const String& AncestorName, IPtr<TRecordingModule>* ModuleOut = nullptr) {
-    IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
-    if (ModuleOut) *ModuleOut = Module;
-    IPtr<IRoot> Root = Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
-                                            AncestorName, "", nullptr, "");
-    Open.push_back(Root);
-    return Root;
+    return OpenModule(Name, AncestorName, ModuleOut);
   }
   /// A new frame module "Name".
-  IPtr<IRoot> NewFrame(const String& Name) {
-    IPtr<TRecordingModule> Module = New<TRecordingModule>(Name + ".kfm", &Log);
-    IPtr<IRoot> Root = Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
-                                            "Frame", "", nullptr, "");
-    Open.push_back(Root);
-    return Root;
-  }
-  /// Nests frame module `Frame` in module `Form`, as the reader of modules would.
+  IPtr<IRoot> NewFrame(const String& Name) { return OpenModule(Name, "Frame"); }
+  /// Nests frame module `Frame` in module `Form`, as the reader of modules does.
   TComponent* NestFrame(const IPtr<IRoot>& Frame, const IPtr<IRoot>& Form) {
     TClass Proxy = Frame->GetRoot()->ClassType();
     TRootHooks::IsProxyClass = [Proxy](TClass C) { return C == Proxy; };
     TRootHooks::ChangeToProxyClass = [](TComponent* Instance, TClass Class) { Instance->SetClassType(Class); };
-    TRootHooks::ReadObjectFromStream = [](TComponentRoot&, TComponent* Instance, TStream* Stream) {
-      TObjectGuard<TReader> Reader(new TReader(Stream, 4096));
-      Reader->ReadRootComponent(Instance);
-    };
     return KilnRoot(Form)->FrameCreateComponent(Proxy, Form->GetRoot());
   }
 

@@ -33,22 +33,14 @@ struct NestedFrameTest : KilnDesignFixture {
   void TearDown() override {
     TRootHooks::IsProxyClass = nullptr;
     TRootHooks::ChangeToProxyClass = nullptr;
-    TRootHooks::ReadObjectFromStream = nullptr;
     FrameModule = FormModule = nullptr;
     KilnDesignFixture::TearDown();
     ProxyRecord.reset();
   }
-  void ReadWithTheReader() {
-    TRootHooks::ReadObjectFromStream = [this](TComponentRoot&, TComponent* Instance, TStream* Stream) {
-      Calls.push_back("ReadObjectFromStream");
-      TObjectGuard<TReader> Reader(new TReader(Stream, 4096));
-      Reader->ReadRootComponent(Instance);
-    };
-  }
+
 };
 
 TEST_F(NestedFrameTest, AProxyClassBecomesANestedInstanceOfItsModule) {
-  ReadWithTheReader();
   TKilnRoot* Form = KilnRoot(FormModule);
   TComponent* Frame = Form->FrameCreateComponent(Proxy, FormModule->GetRoot());
   ASSERT_NE(Frame, nullptr);
@@ -62,7 +54,7 @@ TEST_F(NestedFrameTest, AProxyClassBecomesANestedInstanceOfItsModule) {
   ASSERT_EQ(Frame->ComponentCount(), 1);
   EXPECT_EQ(Frame->Components(0)->Name(), "Button1");
   EXPECT_TRUE(Frame->Components(0)->ComponentState().Contains(csAncestor));
-  EXPECT_EQ(Calls, (std::vector<String>{"ChangeToProxyClass(TFrame1)", "ReadObjectFromStream"}));
+  EXPECT_EQ(Calls, (std::vector<String>{"ChangeToProxyClass(TFrame1)"}));
   // Its components can be selected on the form, since the form may change the frame.
   EXPECT_TRUE(Form->Surface()->ItemFromComponent(Frame->Components(0))->Selectable());
   // The host's flat list reaches into the frame: the frame, then what it holds.
@@ -95,8 +87,8 @@ TEST_F(NestedFrameTest, WhatCannotBeNestedIsRefusedAndLeavesNothing) {
   EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(FormProxy, Root); }),
             "Cannot paste a form or datamodule into another form or datamodule");
   FormProxyRecord.reset();
-  // Without the reader of modules the instance goes again.
-  EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(Proxy, Root); }),
-            "Reading a nested frame is not available");
+  // An instance that cannot take its class goes again.
+  TRootHooks::ChangeToProxyClass = [](TComponent*, TClass) { throw EComponentDesignerException("no class"); };
+  EXPECT_EQ(MessageOf<EComponentDesignerException>([&] { Form->FrameCreateComponent(Proxy, Root); }), "no class");
   EXPECT_EQ(Root->ComponentCount(), 0);
 }
