@@ -210,7 +210,6 @@ void TComponentRoot::InstanceInserted(TPersistent* Instance) {
 
 void TComponentRoot::InstanceRemoved(TPersistent* Instance) {
   FSelectableComponents.clear();
-  FreeRootStream();
   if (FRootUpdateManager && TRootHooks::UpdateManagerRemoved) TRootHooks::UpdateManagerRemoved(FRootUpdateManager, Instance);
   IPtr<ISelections> Items = SelectionItems();
   if (Items) {

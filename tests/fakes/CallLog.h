@@ -20,6 +20,12 @@ struct TCallLog {
       if (C.compare(0, Prefix.size(), Prefix) == 0) ++N;
     return N;
   }
+  /// Every call, one a line: for a failure's message.
+  String Text() const {
+    String All;
+    for (const String& C : Calls) All += C + "\n";
+    return All;
+  }
 };
 
 } // namespace formkit::fakes
