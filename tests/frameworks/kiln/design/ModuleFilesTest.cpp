@@ -264,3 +264,167 @@ TEST_F(ModuleFilesTest, AnInheritedComponentTheAncestorLostIsRecoveredAsTheUserS
 }
 
 } // namespace
+
+namespace {
+
+/// A file that stops taking bytes half way, as a full disk does.
+class TFullDiskStream : public TStream {
+  FK_CLASS(TFullDiskStream, TStream)
+  TFullDiskStream() = default;
+  TFullDiskStream(TStream* File, std::int64_t Room) : FFile(File), FRoom(Room) {}
+  void BeforeDestruction() override {
+    FreeAndNil(FFile);
+    inherited::BeforeDestruction();
+  }
+  std::int64_t Read(void* Buffer, std::int64_t Count) override { return FFile->Read(Buffer, Count); }
+  std::int64_t Write(const void* Buffer, std::int64_t Count) override {
+    std::int64_t Taken = std::min(Count, FRoom);
+    FRoom -= Taken;
+    return Taken > 0 ? FFile->Write(Buffer, Taken) : 0;
+  }
+  std::int64_t Seek(std::int64_t Offset, TSeekOrigin Origin) override { return FFile->Seek(Offset, Origin); }
+
+private:
+  TStream* FFile = nullptr;
+  std::int64_t FRoom = 0;
+};
+FK_IMPLEMENT(TFullDiskStream, "ModuleFilesTest") {}
+
+/// The Kiln designer whose file operations log what they are asked and fail the one
+/// named in `Failing`: "open", "write", "written", "rename to backup", "rename into place".
+class TFlakyFilesDesigner : public TKilnDesigner {
+  FK_CLASS(TFlakyFilesDesigner, TKilnDesigner)
+  using TKilnDesigner::TKilnDesigner;
+  String Failing;
+  std::vector<String> Calls;
+
+  static String Base(const String& Path) { return std::filesystem::path(Path).filename().string(); }
+  TStream* OpenFile(const String& FileSystem, const String& Name, int Mode) override {
+    Calls.push_back("OpenFile(" + Base(Name) + ")");
+    if (Mode != 65280) return TKilnDesigner::OpenFile(FileSystem, Name, Mode);
+    if (Failing == "open") throw EFCreateError("Cannot create file \"" + Name + "\". No space left on device");
+    TStream* File = TKilnDesigner::OpenFile(FileSystem, Name, Mode);
+    return Failing == "write" ? new TFullDiskStream(File, 100) : File;
+  }
+  void FileWritten(const String&, TStream*) override {
+    Calls.push_back("FileWritten");
+    if (Failing == "written") throw EWriteError("Stream write error");
+  }
+  bool DeleteFile(const String& FileSystem, const String& Name) override {
+    Calls.push_back("DeleteFile(" + Base(Name) + ")");
+    return TKilnDesigner::DeleteFile(FileSystem, Name);
+  }
+  bool RenameFile(const String& FileSystem, const String& OldName, const String& NewName) override {
+    Calls.push_back("RenameFile(" + Base(OldName) + "," + Base(NewName) + ")");
+    bool ToBackup = NewName.find(".~") != String::npos;
+    if (Failing == (ToBackup ? "rename to backup" : "rename into place")) return false;
+    return TKilnDesigner::RenameFile(FileSystem, OldName, NewName);
+  }
+};
+FK_IMPLEMENT(TFlakyFilesDesigner, "ModuleFilesTest") {}
+
+struct FailingDiskTest : ModuleFilesTest {
+  TFlakyFilesDesigner* Files = nullptr;
+  void SetUp() override {
+    ModuleFilesTest::SetUp();
+    Designers()->UnregisterDesigner(Designer);
+    IPtr<TFlakyFilesDesigner> Flaky = New<TFlakyFilesDesigner>(InterfaceOf<IDesignEnvironment>(Env.Get()));
+    Files = Flaky.Get();
+    Designer = InterfaceOf<IComponentDesigner>(Flaky.Get());
+    Designers()->RegisterDesigner(Designer);
+  }
+};
+
+TEST_F(FailingDiskTest, SaveWorksInTheOrderOfATemporaryFileABackupAndARename) {
+  Env->CreateBackups = true;
+  IPtr<IRoot> Form = NewFormAt("Form1");
+  BuildSample(Form);
+  Files->Calls.clear();
+  Form->Save(); // changed since it was made; no file yet to keep
+  EXPECT_EQ(Files->Calls, (std::vector<String>{"OpenFile(Form1.$$$)", "FileWritten", "DeleteFile(Form1.~kfm)",
+                                               "RenameFile(Form1.$$$,Form1.kfm)"}));
+  static_cast<TButton*>(Form->GetRoot()->FindComponent("Button1"))->SetCaption("Changed");
+  KilnRoot(Form)->Modified();
+  Files->Calls.clear();
+  Form->Save(); // changed since saved: the file becomes the backup
+  EXPECT_EQ(Files->Calls, (std::vector<String>{"OpenFile(Form1.$$$)", "FileWritten", "DeleteFile(Form1.~kfm)",
+                                               "RenameFile(Form1.kfm,Form1.~kfm)", "RenameFile(Form1.$$$,Form1.kfm)"}));
+  Files->Calls.clear();
+  Form->Save(); // unchanged: replaced without a backup
+  EXPECT_EQ(Files->Calls,
+            (std::vector<String>{"OpenFile(Form1.$$$)", "FileWritten", "DeleteFile(Form1.kfm)", "RenameFile(Form1.$$$,Form1.kfm)"}));
+}
+
+TEST_F(FailingDiskTest, WhicheverStepFailsTheLastGoodSaveSurvivesAndTheModuleStaysModified) {
+  Env->CreateBackups = true;
+  IPtr<IRoot> Form = NewFormAt("Form1");
+  BuildSample(Form);
+  Form->Save();
+  auto* Button = static_cast<TButton*>(Form->GetRoot()->FindComponent("Button1"));
+  int Edit = 0;
+  for (const char* Step : {"open", "write", "written", "rename to backup", "rename into place"}) {
+    SCOPED_TRACE(Step);
+    std::vector<std::uint8_t> LastGood = FileBytes(PathOf("Form1.kfm"));
+    Button->SetCaption("Edit " + IntToStr(++Edit));
+    KilnRoot(Form)->Modified();
+    Files->Failing = Step;
+    EXPECT_THROW(Form->Save(), Exception);
+    Files->Failing.clear();
+    bool Kept = FileBytes(PathOf("Form1.kfm")) == LastGood || FileBytes(PathOf("Form1.~kfm")) == LastGood;
+    EXPECT_TRUE(Kept) << "the last good save is lost";
+    EXPECT_TRUE(Form->GetRoot());
+    EXPECT_NE(Form->GetModifyTime(), Form->GetTimeAtLoad()) << "still modified";
+    // The next save goes through and reopens as the module is.
+    Form->Save();
+    IPtr<IRoot> Check = OpenAt("Form1.kfm");
+    EXPECT_EQ(FormImage(Check->GetRoot()), FormImage(Form->GetRoot()));
+    Check->Close();
+  }
+}
+
+TEST_F(ModuleFilesTest, LinksToModulesThatAreNotOpenStopASaveUntilTheUserRedirectsThem) {
+  IPtr<IRoot> Form1 = NewFormAt("Form1");
+  IPtr<IRoot> Form2 = NewFormAt("Form2");
+  IPtr<IRoot> Form3 = NewFormAt("Form3");
+  auto* Label = static_cast<TLabel*>(KilnRoot(Form1)->CreateComponent(TLabel::StaticClass(), Form1->GetRoot(), 8, 8, 65, 17));
+  Label->SetFocusControl(static_cast<TWinControl*>(
+      KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 121, 23)));
+  auto* Other = static_cast<TLabel*>(KilnRoot(Form1)->CreateComponent(TLabel::StaticClass(), Form1->GetRoot(), 8, 40, 65, 17));
+  Other->SetFocusControl(static_cast<TWinControl*>(
+      KilnRoot(Form3)->CreateComponent(TEdit::StaticClass(), Form3->GetRoot(), 8, 8, 121, 23)));
+  KilnRoot(Form1)->Modified();
+  // Form1 depends on the two modules it links to.
+  std::vector<String> Linked;
+  KilnRoot(Form1)->GetDependencies([&](const IPtr<IRoot>& R) { Linked.push_back(R->GetRootName()); });
+  EXPECT_EQ(Linked, (std::vector<String>{"Form2", "Form3"}));
+  Form1->Save();
+  Form1->Close();
+  Form2->Close();
+  Form3->Close();
+
+  // Reopened alone, its links wait for the other modules.
+  IPtr<IRoot> Alone = OpenAt("Form1.kfm");
+  KilnRoot(Alone)->Modified();
+  auto Refusal = [&] {
+    try {
+      Alone->Save();
+      return String("saved");
+    } catch (const EComponentDesignerException& E) {
+      return E.Message();
+    }
+  };
+  EXPECT_EQ(Refusal(), "Module \"Form1\" references other modules and cannot be saved until the following modules are "
+                       "loaded: Form2,Form3");
+  std::vector<String> Asked;
+  TKilnRoot::RedirectLinksAnswer = [&](const String& Root, const String& Linked) {
+    Asked.push_back(Root + "->" + Linked);
+    return Asked.size() == 1 ? qrYes : qrNo;
+  };
+  EXPECT_EQ(Refusal(), "Module \"Form1\" references another module and cannot be saved until Form3 is loaded");
+  EXPECT_EQ(Asked, (std::vector<String>{"Form1->Form2", "Form1->Form3"}));
+  EXPECT_TRUE(KilnRoot(Alone)->HadReadError()) << "a redirect changes what was read";
+  TKilnRoot::RedirectLinksAnswer = [](const String&, const String&) { return qrYes; };
+  EXPECT_EQ(Refusal(), "saved");
+}
+
+} // namespace
