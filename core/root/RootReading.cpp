@@ -23,6 +23,9 @@ namespace formkit {
 FK_RESOURCESTRING(sPasteError, "Cannot paste %s in the designer");
 
 namespace {
+/// The buffer of the copy of a form file into memory.
+constexpr std::int64_t FileReadBufferSize = 1048576;
+
 /// The name a class stands for in a form file: "TForm1" gives "Form1".
 String WithoutFirstCharacter(const String& Name) { return Name.empty() ? Name : Name.substr(1); }
 
@@ -43,9 +46,16 @@ void TComponentRoot::ReadExistingModule(const TCreateArgs& Args) {
     CreateFromStream(Stream.Get(), Args.AncestorRoot);
     return;
   }
-  TObjectGuard<TStream> Stream(FDesigner->OpenFile(FFileSystem, FFileName, fmOpenRead | fmShareDenyNone));
+  // The file is read whole first: the reader's many small reads then cost no calls to
+  // the file system, and the file is closed while the module is made.
+  TObjectGuard<TMemoryStream> Image(new TMemoryStream);
+  {
+    TObjectGuard<TStream> File(FDesigner->OpenFile(FFileSystem, FFileName, fmOpenRead | fmShareDenyNone));
+    Image->CopyFrom(File.Get(), 0, FileReadBufferSize);
+  }
+  Image->SetPosition(0);
   FDiskAge = FDesigner->GetFileAge(FFileSystem, FFileName);
-  CreateFromStream(Stream.Get(), Args.AncestorRoot);
+  CreateFromStream(Image.Get(), Args.AncestorRoot);
 }
 
 void TComponentRoot::CreateFromStream(TStream* Stream, const IPtr<IRoot>& AncestorRoot) {
