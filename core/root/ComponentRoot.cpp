@@ -72,8 +72,12 @@ void TComponentRoot::Create(const TCreateArgs& Args) {
       ReadExistingModule(Args);
     }
     Initializing = true;
+    LoadDependentModules(FRoot);
+    // A module that differs from its stream after an error passed over keeps its new stamp.
     InternalInitializeDesigner(false);
     UpdateOptions();
+    // Reading and the surface can add references.
+    LoadDependentModules(FRoot);
   } catch (...) {
     if (Initializing) {
       FAllowNoSelection = true;

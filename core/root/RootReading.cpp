@@ -44,6 +44,7 @@ void TComponentRoot::ReadExistingModule(const TCreateArgs& Args) {
     TObjectGuard<TOleStream> Stream(new TOleStream(IPtr<IStream>(Args.Stream)));
     FDiskAge = Args.Stream->GetModifyTime();
     CreateFromStream(Stream.Get(), Args.AncestorRoot);
+    FReadStreamSize = Stream->Size();
     return;
   }
   // The file is read whole first: the reader's many small reads then cost no calls to
@@ -56,6 +57,7 @@ void TComponentRoot::ReadExistingModule(const TCreateArgs& Args) {
   Image->SetPosition(0);
   FDiskAge = FDesigner->GetFileAge(FFileSystem, FFileName);
   CreateFromStream(Image.Get(), Args.AncestorRoot);
+  FReadStreamSize = Image->Size();
 }
 
 void TComponentRoot::CreateFromStream(TStream* Stream, const IPtr<IRoot>& AncestorRoot) {
@@ -74,9 +76,7 @@ void TComponentRoot::CreateFromStream(TStream* Stream, const IPtr<IRoot>& Ancest
   String ClassName, AncestorClassName;
   GetCreateInfoFrom(S, ClassName, AncestorClassName, AncestorRoot);
   CreateRootAs(ClassName, AncestorClassName, AncestorRoot);
-  std::int64_t Start = S->Position();
   ReadObjectFromStream(FRoot, S);
-  FReadStreamSize = S->Position() - Start;
   ModifiedUpdateNotification();
   NotifyGlobalLoading();
 }

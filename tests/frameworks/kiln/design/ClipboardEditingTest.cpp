@@ -206,6 +206,24 @@ TEST_F(ClipboardEditingTest, DeleteKeepsAnUndoStreamAndUndeletePutsTheComponents
   EXPECT_NE(Form1->GetRoot()->ComponentCount(), 0);
 }
 
+TEST_F(ClipboardEditingTest, ACutMovesTheSelectionThroughTheClipboardIntoAnotherModule) {
+  SelectOnly(Kiln, {"Label1", "Edit1"});
+  TObjectGuard<TMemoryStream> S(new TMemoryStream);
+  Kiln->CopySelectionToStream(S.Get());
+  Kiln->CopyStreamToClipboard(S.Get());
+  Kiln->DeleteSelection(false);
+  EXPECT_EQ(Find<TLabel>(Kiln, "Label1"), nullptr);
+  IPtr<IRoot> Form2 = NewForm("Form2");
+  TKilnRoot* Kiln2 = KilnRoot(Form2);
+  Kiln2->Activate();
+  TObjectGuard<TMemoryStream> Board(Kiln2->GetClipboardStream());
+  Kiln2->PasteSelectionFromStream(Board.Get(), nullptr, Rect(8, 48, 100, 100));
+  auto* Label = Find<TLabel>(Kiln2, "Label1");
+  ASSERT_NE(Label, nullptr);
+  EXPECT_EQ(Label->FocusControl(), Find<TEdit>(Kiln2, "Edit1"));
+  EXPECT_EQ(Label->BoundsRect(), Rect(8, 48, 73, 65));
+}
+
 TEST_F(ClipboardEditingTest, AnInheritedComponentCannotBeDeletedAndNothingChanges) {
   IPtr<IRoot> Form2 = NewDescendant("Form2", "Form1");
   TKilnRoot* Kiln2 = KilnRoot(Form2);

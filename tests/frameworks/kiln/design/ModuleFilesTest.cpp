@@ -398,9 +398,30 @@ TEST_F(ModuleFilesTest, LinksToModulesThatAreNotOpenStopASaveUntilTheUserRedirec
   KilnRoot(Form1)->GetDependencies([&](const IPtr<IRoot>& R) { Linked.push_back(R->GetRootName()); });
   EXPECT_EQ(Linked, (std::vector<String>{"Form2", "Form3"}));
   Form1->Save();
+  Form2->Save();
+  Form3->Save();
   Form1->Close();
   Form2->Close();
   Form3->Close();
+
+  // Opened where the host can open modules by name, the modules it links to come along.
+  Env->OnOpenModuleByName = [this](const String& Name) { OpenAt(Name + ".kfm"); };
+  IPtr<IRoot> WithLinks = OpenAt("Form1.kfm");
+  EXPECT_EQ(Log.Count("OpenModuleByName(Form2)"), 1);
+  EXPECT_EQ(Log.Count("OpenModuleByName(Form3)"), 1);
+  auto* Linked2 = static_cast<TLabel*>(WithLinks->GetRoot()->FindComponent("Label1"))->FocusControl();
+  ASSERT_NE(Linked2, nullptr);
+  EXPECT_EQ(Linked2->Owner()->Name(), "Form2");
+  std::vector<String> Units;
+  KilnRoot(WithLinks)->GetUnits([&](const String& Unit) { Units.push_back(Unit); });
+  // Label1's class up to TComponent, the classes of its font and of the edit it
+  // focuses, Label2 adding nothing new; from the last recorded to the first.
+  EXPECT_EQ(Units, (std::vector<String>{"KilnControls", "KilnStdCtrls", "KilnGraphics", "KilnGraphics", "Classes",
+                                        "KilnControls", "KilnControls", "KilnStdCtrls"}));
+  for (const char* Name : {"Form1", "Form2", "Form3"})
+    for (const IPtr<IRoot>& R : Open)
+      if (R->GetRoot() && R->GetRootName() == Name) R->Close();
+  Env->OnOpenModuleByName = nullptr;
 
   // Reopened alone, its links wait for the other modules.
   IPtr<IRoot> Alone = OpenAt("Form1.kfm");
