@@ -128,6 +128,13 @@ TEST_F(ModuleFilesTest, SavingWritesATemporaryFileKeepsABackupAndRefusesReadOnly
   EXPECT_EQ(FileBytes(PathOf("Form1.~kfm")), First);
   EXPECT_NE(FileBytes(PathOf("Form1.kfm")), First);
 
+  // Another program writes the file: the module notices once.
+  EXPECT_FALSE(Form->CheckFileDate());
+  std::filesystem::last_write_time(PathOf("Form1.kfm"),
+                                   std::filesystem::last_write_time(PathOf("Form1.kfm")) + std::chrono::seconds(5));
+  EXPECT_TRUE(Form->CheckFileDate());
+  EXPECT_FALSE(Form->CheckFileDate());
+
   // A read-only file is refused and left alone; the module stays modified.
   std::vector<std::uint8_t> Second = FileBytes(PathOf("Form1.kfm"));
   MakeReadOnly(PathOf("Form1.kfm"));
