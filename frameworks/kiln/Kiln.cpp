@@ -1,6 +1,9 @@
 //===- frameworks/kiln/Kiln.cpp - Starting and stopping the framework ----===//
 #include "frameworks/kiln/Kiln.h"
 
+#include "frameworks/kiln/KilnSplitters.h"
+#include "frameworks/kiln/KilnToolBars.h"
+
 namespace formkit {
 
 namespace {
@@ -13,7 +16,7 @@ std::vector<TClass> KilnClasses() {
           TCustomFrame::StaticClass(), TFrame::StaticClass(),      TDataModule::StaticClass(),
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
           TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass(),
-          TStatusBar::StaticClass()};
+          TStatusBar::StaticClass(),   TToolBar::StaticClass(),    TSplitter::StaticClass()};
 }
 } // namespace
 
@@ -37,6 +40,7 @@ void FinalizeKiln() {
   if (GroupBeforeKiln) ActivateClassGroup(GroupBeforeKiln);
   GroupBeforeKiln = nullptr;
   detail::FreeClipboard();
+  detail::FreeApplication();
   if (Screen()->FormCount() == 0) detail::FreeScreen();
 }
 

@@ -17,6 +17,7 @@
 #pragma once
 
 #include "frameworks/kiln/KilnControls.h"
+#include "frameworks/kiln/KilnWindows.h"
 
 namespace formkit {
 
@@ -89,6 +90,35 @@ class FK_API TCustomForm : public TDesignableRoot<TWinControl> {
   /// The monitor that holds most of the form.
   TMonitor* Monitor() const;
 
+  // Window state and placement (defined beside the placement, in KilnWindows) ------
+  TWindowState WindowState() const noexcept { return FWindowState; }
+  /// Maximising keeps the bounds as the restored rectangle and fills the work area of
+  /// the form's monitor; going back to normal takes the restored rectangle again.
+  void SetWindowState(TWindowState Value);
+  /// Where the form goes when it is restored: its bounds while it is normal.
+  TRect RestoredBounds() const noexcept;
+  /// The state, the restored rectangle and the show command; see `TWindowPlacement`.
+  TWindowPlacement Placement() const;
+  /// Applies a placement at once. Raises `EInvalidOperation` for a length other than 44
+  /// or an unknown show command, and then nothing has changed.
+  void SetPlacement(const TWindowPlacement& Value);
+  /// Has a tool window's frame: `bsToolWindow` or `bsSizeToolWin`.
+  bool IsToolWindow() const noexcept;
+  /// Makes a visible form the active one; the form that was active hears `WM_ACTIVATE`
+  /// with 0, this one with 1.
+  void Activate();
+  TPosition Position() const noexcept { return FPosition; }
+  void SetPosition(TPosition Value) noexcept { FPosition = Value; }
+  TDefaultMonitor DefaultMonitor() const noexcept { return FDefaultMonitor; }
+  void SetDefaultMonitor(TDefaultMonitor Value) noexcept { FDefaultMonitor = Value; }
+  /// Where the form's help is: a keyword, or a context number (0 for none).
+  THelpType HelpType() const noexcept { return FHelpType; }
+  void SetHelpType(THelpType Value) noexcept { FHelpType = Value; }
+  int HelpContext() const noexcept { return FHelpContext; }
+  void SetHelpContext(int Value) noexcept { FHelpContext = Value; }
+  const String& HelpKeyword() const noexcept { return FHelpKeyword; }
+  void SetHelpKeyword(const String& Value) { FHelpKeyword = Value; }
+
   TCloseEvent OnClose;
   TNotifyEvent OnShow;
   TNotifyEvent OnHide;
@@ -104,6 +134,15 @@ protected:
 private:
   TFormBorderStyle FBorderStyle = bsSizeable;
   bool FScaled = true;
+  TWindowState FWindowState = wsNormal;
+  TPosition FPosition = poDesigned;
+  TDefaultMonitor FDefaultMonitor = dmActiveForm;
+  THelpType FHelpType = htContext;
+  int FHelpContext = 0;
+  String FHelpKeyword;
+  TRect FRestoredBounds;
+  TPoint FMinPosition{-1, -1};
+  TPoint FMaxPosition{-1, -1};
 };
 
 /// The form a program derives its windows from.
