@@ -525,16 +525,16 @@ void InheritFrom(TComponentRoot& Root, const String& ClassName, TComponent* Ance
   TComponent* Instance = Root.Root();
   CreateSubClass(Instance, ClassName, Root.GetModule() ? Root.GetModule()->GetUnitName() : String(),
                  Ancestor->ClassType());
-  // The descendant starts as a full image of its ancestor.
+  // The descendant starts as a full image of its ancestor, read with the module's own
+  // hooks: nested frames and handlers find their classes and methods.
   TObjectGuard<TMemoryStream> Image(new TMemoryStream);
   {
     TObjectGuard<TWriter> Writer(new TWriter(Image.Get(), 4096));
+    Writer->OnFindAncestor = TFindAncestorEvent::Bind<&TComponentRoot::WriterFindAncestor>(&Root);
     Writer->WriteDescendent(Ancestor, nullptr);
   } // the writer flushes as it goes
   Image->SetPosition(0);
-  TObjectGuard<TReader> Reader(new TReader(Image.Get(), 4096));
-  Reader->OnFindMethod = TFindMethodEvent::Bind<&TComponentRoot::FindObjectMethod>(&Root);
-  Reader->ReadRootComponent(Instance);
+  Root.ReadObjectFromStream(Instance, Image.Get());
   // Everything the image brought has a twin in the ancestor.
   for (int I = 0; I < Instance->ComponentCount(); ++I) Instance->Components(I)->SetAncestor(true);
 }

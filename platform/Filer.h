@@ -411,6 +411,9 @@ private:
   /// The component being written is inherited, but stands under another parent than in
   /// the ancestor: the reader will move it, like a new child, to the end of this parent.
   bool FAncestorMoved = false;
+  /// The component being written is one the ancestor has: its ancestor came from the
+  /// ancestor's tree, not from `OnFindAncestor` (which gives a nested frame its module).
+  bool FAncestorInherited = false;
 };
 
 //===----------------------------------------------------------------------===//

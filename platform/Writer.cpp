@@ -503,10 +503,11 @@ void TWriter::WriteDescendent(TComponent* ARoot, TComponent* AAncestor) {
 
 void TWriter::WriteComponent(TComponent* Component) {
   auto Restore = Finally([this, Component, OldAncestor = FAncestor, OldRootAncestor = FRootAncestor,
-                          OldMoved = FAncestorMoved]() noexcept {
+                          OldMoved = FAncestorMoved, OldInherited = FAncestorInherited]() noexcept {
     FAncestor = OldAncestor;
     FRootAncestor = OldRootAncestor;
     FAncestorMoved = OldMoved;
+    FAncestorInherited = OldInherited;
     Component->SetWriting(false);
   });
   Component->SetWriting(true);
@@ -520,6 +521,7 @@ void TWriter::WriteComponent(TComponent* Component) {
   } else if (Component != FRoot) {
     FAncestor = nullptr;
   }
+  FAncestorInherited = FAncestor != nullptr;
   if (OnFindAncestor) {
     auto* A = dynamic_cast<TComponent*>(FAncestor);
     if (!FAncestor || A) {
@@ -538,7 +540,7 @@ void TWriter::WriteChild(TComponent* Child) {
 void TWriter::WriteData(TComponent* Instance) {
   TFilerFlags Flags;
   int Pos = -1;
-  if (FAncestor) Flags.Include(ffInherited);
+  if (FAncestorInherited) Flags.Include(ffInherited);
   if (Instance->ComponentState().Contains(csInline)) Flags.Include(ffInline);
   if (FChildren && TakesChildPosition(Instance)) {
     Flags.Include(ffChildPos);

@@ -331,6 +331,12 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   void SelectReadStream(TStream* Stream, TComponent* Parent, bool Adjust, const TRect& Rect);
   /// The module came from a text form file, and is written as text.
   bool GetTextLYT() const noexcept { return FLYTToText; }
+  /// From the next write on, the module is written as text (true) or in binary.
+  void SetTextLYT(bool AsText) noexcept {
+    FLYTToText = AsText;
+    FOrigLYTFormat = AsText ? 2 : 1;
+    FreeRootStream();
+  }
   /// What was read may differ from the stream: an error was passed over.
   bool HadReadError() const noexcept { return FReadError; }
   // The reader's hooks while the module is read.
