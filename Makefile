@@ -1,8 +1,15 @@
 # The commands a person types. Each installs what a fresh machine lacks first.
-.PHONY: test fuzz bench test-build release deps clean
+.PHONY: demo test fuzz bench test-build release deps clean
 
 deps:
 	@bash scripts/install-deps
+
+# The host in release, then the demo on a copy of the examples: modules, sources and
+# pictures under build/demo.
+demo: deps
+	cmake --preset release
+	cmake --build --preset release --target formkit
+	bash scripts/demo
 
 # clang under AddressSanitizer, UndefinedBehaviorSanitizer and LeakSanitizer, with the fuzz targets.
 test-build: deps
@@ -20,6 +27,7 @@ test: test-build
 	ctest --preset test
 	cmake --preset release
 	cmake --build --preset release
+	bash scripts/check-consumer
 	ctest --preset release
 
 fuzz: test-build

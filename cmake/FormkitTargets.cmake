@@ -11,11 +11,26 @@ function(fk_apply_common_options target)
   endif()
 endfunction()
 
-# fk_add_library(name SOURCES ... DEPS ...): a static library of one folder.
+# fk_add_library(name SOURCES ... DEPS ...): a static library of one folder. A library of
+# the package (not a test double) is installed with its headers and gets the name users
+# write, formkit::<folder> (formkit_core is formkit::core), also as an alias in the build.
 function(fk_add_library name)
   cmake_parse_arguments(ARG "" "" "SOURCES;DEPS" ${ARGN})
   add_library(${name} STATIC ${ARG_SOURCES})
-  target_include_directories(${name} PUBLIC ${PROJECT_SOURCE_DIR})
+  # Inside the package headers name each other from its top ("core/Designers.h"); users
+  # write <formkit/core/Designers.h>.
+  target_include_directories(${name} PUBLIC $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}>
+                                            $<INSTALL_INTERFACE:include> $<INSTALL_INTERFACE:include/formkit>)
+  if(NOT name MATCHES "^formkit_testsupport" AND NOT CMAKE_CURRENT_SOURCE_DIR MATCHES "/(tests|bench|fuzz)(/|$)")
+    string(REGEX REPLACE "^formkit_" "" short ${name})
+    set_target_properties(${name} PROPERTIES EXPORT_NAME ${short})
+    add_library(formkit::${short} ALIAS ${name})
+    set_property(GLOBAL APPEND PROPERTY FK_PACKAGE_LIBRARIES ${name})
+    install(TARGETS ${name} EXPORT formkitTargets ARCHIVE DESTINATION lib)
+    file(RELATIVE_PATH folder ${PROJECT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR})
+    install(DIRECTORY ${CMAKE_CURRENT_SOURCE_DIR}/ DESTINATION include/formkit/${folder}
+            FILES_MATCHING PATTERN "*.h" PATTERN "CMakeFiles" EXCLUDE)
+  endif()
   target_link_libraries(${name} PUBLIC ${ARG_DEPS})
   fk_apply_common_options(${name})
   if(FK_SANITIZE)

@@ -1,0 +1,162 @@
+//===- tests/host/FormkitCommandTest.cpp - The formkit command on the examples ===//
+//
+// Each subcommand run on a copy of the examples in a scratch directory, with its
+// output, its messages and its exit code asserted; the demo script's results
+// reopened; and every kind of bad input refused with one message, a non-zero
+// exit and no file changed.
+//
+//===----------------------------------------------------------------------===//
+#include "host/DesignHost.h"
+#include "host/FormkitCommand.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <sstream>
+
+using namespace formkit;
+
+namespace {
+
+namespace fs = std::filesystem;
+
+struct FormkitCommandTest : ::testing::Test {
+  fs::path Dir;
+  fs::path Home = fs::current_path();
+  std::ostringstream Out, Err;
+
+  void SetUp() override {
+    char Template[] = "/tmp/fk-command-XXXXXX";
+    ASSERT_NE(::mkdtemp(Template), nullptr);
+    Dir = Template;
+    for (const auto& Entry : fs::directory_iterator(FK_EXAMPLES_DIR))
+      if (Entry.is_regular_file()) fs::copy_file(Entry.path(), Dir / Entry.path().filename());
+  }
+  void TearDown() override {
+    std::error_code Ignored;
+    fs::current_path(Home, Ignored);
+    fs::remove_all(Dir, Ignored);
+  }
+  String At(const String& File) const { return (Dir / File).string(); }
+  int Run(std::vector<String> Args) {
+    Out.str("");
+    Err.str("");
+    return RunFormkit(Args, Out, Err);
+  }
+  static String Read(const String& Path) {
+    std::ifstream In(Path, std::ios::binary);
+    std::ostringstream S;
+    S << In.rdbuf();
+    return S.str();
+  }
+  /// Every file of the scratch directory with its bytes.
+  std::map<String, String> Files() const {
+    std::map<String, String> All;
+    for (const auto& Entry : fs::directory_iterator(Dir)) All[Entry.path().filename().string()] = Read(Entry.path().string());
+    return All;
+  }
+  void WriteScript(const String& Name, const String& Text) { std::ofstream(At(Name)) << Text; }
+};
+
+TEST_F(FormkitCommandTest, TreeListsTheComponentsNestedAndNestedFramesWithTheirOwn) {
+  ASSERT_EQ(Run({"tree", At("Form2.kfm")}), feOK) << Err.str();
+  EXPECT_EQ(Out.str(), "Form2: TForm2\n"
+                       "  Panel1: TPanel\n"
+                       "    Label1: TLabel\n"
+                       "    Edit1: TEdit\n"
+                       "    CheckBox1: TCheckBox\n"
+                       "  Frame11: TFrame1\n"
+                       "    Label1: TLabel\n"
+                       "    Edit1: TEdit\n"
+                       "  Button1: TButton\n"
+                       "  Button2: TButton\n"
+                       "  StatusBar1: TStatusBar\n"
+                       "  Timer1: TTimer\n");
+}
+
+TEST_F(FormkitCommandTest, PropsShowsTheInspectorsListAndSetWritesThroughTheEditor) {
+  ASSERT_EQ(Run({"props", At("Form1.kfm"), "Button1"}), feOK) << Err.str();
+  EXPECT_NE(Out.str().find("Caption\tOK\tpaMultiSelect,paRevertable\n"), String::npos) << Out.str();
+  EXPECT_NE(Out.str().find("Left\t296\tpaMultiSelect,paRevertable\n"), String::npos) << Out.str();
+  EXPECT_NE(Out.str().find("OnClick\t\tpaValueList,paMultiSelect,paSortList,paRevertable\n"), String::npos) << Out.str();
+
+  ASSERT_EQ(Run({"set", At("Form1.kfm"), "Button1.Caption", "Done"}), feOK) << Err.str();
+  ASSERT_EQ(Run({"props", At("Form1.kfm"), "Button1"}), feOK);
+  EXPECT_NE(Out.str().find("Caption\tDone\t"), String::npos);
+  // The descendant that did not override the caption shows it too when it opens.
+  ASSERT_EQ(Run({"props", At("Form2.kfm"), "Button2"}), feOK);
+  EXPECT_NE(Out.str().find("Caption\tCancel\t"), String::npos);
+}
+
+TEST_F(FormkitCommandTest, ConvertNewAndAnUneditedSaveKeepWhatTheyShould) {
+  String Text = Read(At("Frame1.kfm"));
+  ASSERT_EQ(Run({"convert", At("Frame1.kfm"), "--binary"}), feOK) << Err.str();
+  EXPECT_EQ(Read(At("Frame1.kfm")).substr(0, 1), String(1, '\xFF')) << "a resource header";
+  ASSERT_EQ(Run({"convert", At("Frame1.kfm"), "--text"}), feOK) << Err.str();
+  EXPECT_EQ(Read(At("Frame1.kfm")), Text) << "back to the same text";
+
+  ASSERT_EQ(Run({"new", At("Form3.kfm"), "--inherit", "Form2"}), feOK) << Err.str();
+  EXPECT_EQ(Read(At("Form3.fks")), "class TForm3 : TForm2\n");
+  ASSERT_EQ(Run({"tree", At("Form3.kfm")}), feOK) << Err.str();
+  EXPECT_EQ(Out.str().substr(0, 31), "Form3: TForm3\n  Panel1: TPanel\n");
+}
+
+TEST_F(FormkitCommandTest, TheDemoDesignsByHandAndItsFilesReopenAsTheyWereLeft) {
+  String Frame = Read(At("Frame1.kfm"));
+  fs::current_path(Dir);
+  ASSERT_EQ(Run({"run", At("demo.design")}), feOK) << Err.str();
+  EXPECT_NE(Out.str().find("14: bind Button3.OnClick HelpClick\n"), String::npos) << Out.str();
+  // The handler is in the source; the descendant has the ancestor's new button and caption.
+  EXPECT_NE(Read(At("Form1.fks")).find("handler HelpClick(Sender: TObject)\nbegin\nend\n"), String::npos);
+  EXPECT_NE(Read(At("Form1.fks")).find("  field Button3: TButton\n"), String::npos);
+  EXPECT_EQ(Read(At("Form2.fks")).find("Button3"), String::npos) << "an inherited name is no field of its own";
+  ASSERT_EQ(Run({"props", At("Form2.kfm"), "Button2"}), feOK);
+  EXPECT_NE(Out.str().find("Caption\tClose\t"), String::npos);
+  ASSERT_EQ(Run({"props", At("Form2.kfm"), "Button3"}), feOK) << Err.str();
+  EXPECT_NE(Out.str().find("OnClick\tHelpClick\t"), String::npos);
+  EXPECT_EQ(Read(At("Frame1.kfm")), Frame) << "opened and saved without an edit: the same bytes";
+}
+
+TEST_F(FormkitCommandTest, HelpAndUsageErrorsExitWithTwo) {
+  EXPECT_EQ(Run({"--help"}), feOK);
+  EXPECT_NE(Out.str().find("Exit codes: 0 done;"), String::npos);
+  EXPECT_EQ(Run({"set", "--help"}), feOK);
+  EXPECT_EQ(Out.str().substr(0, 41), "Usage: formkit set FILE NAME.PROP VALUE\n\n");
+  EXPECT_EQ(Run({}), feUsage);
+  EXPECT_EQ(Run({"draw"}), feUsage);
+  EXPECT_EQ(Err.str(), "Unknown subcommand 'draw'. Try 'formkit --help'.\n");
+  EXPECT_EQ(Run({"convert", At("Form1.kfm"), "--pdf"}), feUsage);
+  EXPECT_EQ(Err.str(), "Unknown option '--pdf' of 'formkit convert'. Try 'formkit convert --help'.\n");
+  EXPECT_EQ(Run({"props", At("Form1.kfm")}), feUsage);
+  EXPECT_EQ(Err.str(), "'formkit props' needs FILE NAME. Try 'formkit props --help'.\n");
+}
+
+TEST_F(FormkitCommandTest, BadInputIsRefusedWithOneMessageAndNoFileChanges) {
+  WriteScript("bad.design", "open Form1.kfm\nset Button1.Caption Changed\nsave\nfrobnicate\n");
+  std::ofstream(At("Broken.kfm")) << "object Broken: TForm\n  Caption = \n";
+  auto Before = Files();
+  fs::current_path(Dir);
+  struct TCase {
+    std::vector<String> Args;
+    String Message;
+  };
+  std::vector<TCase> Cases{
+      {{"tree", At("Missing.kfm")}, "formkit tree: Module " + At("Missing.kfm") + " not found\n"},
+      {{"tree", At("Broken.kfm")}, "formkit tree: Line 3: value expected\n"},
+      {{"set", At("Form1.kfm"), "Button1.Colour", "clRed"}, "formkit set: Component Button1 has no property 'Colour'\n"},
+      {{"set", At("Form1.kfm"), "Button9.Caption", "x"}, "formkit set: Module Form1 has no component named 'Button9'\n"},
+      {{"set", At("Form1.kfm"), "Button1.Left", "wide"}, "formkit set: 'wide' is not a valid integer value\n"},
+      {{"set", At("Form1.kfm"), "Caption", "x"}, "formkit set: 'Caption' is not of the form NAME.PROPERTY\n"},
+      {{"run", At("bad.design")}, "formkit run: " + At("bad.design") + ":4: unknown step 'frobnicate'\n"},
+  };
+  for (const TCase& Case : Cases) {
+    SCOPED_TRACE(Case.Args[0] + " " + Case.Args.back());
+    EXPECT_EQ(Run(Case.Args), feFailed);
+    EXPECT_EQ(Err.str(), Case.Message);
+    EXPECT_EQ(Files(), Before) << "a file changed";
+  }
+}
+
+} // namespace
