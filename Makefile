@@ -33,8 +33,9 @@ test: test-build
 fuzz: test-build
 	bash scripts/fuzz-campaign
 
+# Every benchmark, ending with one table: operation, size, formkit, baseline, ratio.
 bench: release
-	@for b in build/release/bench/*/fk_bench_*; do echo "== $$b"; $$b --benchmark_min_time=0.2; done
+	@bash scripts/bench-table
 
 clean:
 	rm -rf build
