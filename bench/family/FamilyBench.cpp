@@ -21,12 +21,8 @@
 //
 //===----------------------------------------------------------------------===//
 #include "bench/BenchTiming.h"
-#include "core/DesignCore.h"
-#include "core/Designers.h"
-#include "frameworks/kiln/Kiln.h"
+#include "bench/KilnDesignRun.h"
 #include "frameworks/kiln/KilnStdCtrls.h"
-#include "frameworks/kiln/design/KilnDesign.h"
-#include "tests/fakes/RecordingEnvironment.h"
 #include "tests/fakes/RecordingModule.h"
 #include "tests/frameworks/kiln/design/ClassFamily.h"
 
@@ -42,13 +38,7 @@ namespace {
 using bench::BestOf;
 using bench::SecondsOf;
 
-/// The design core with the Kiln designer and a recording host, for the whole run.
-struct TDesignRun {
-  fakes::TCallLog Log;
-  IPtr<fakes::TRecordingEnvironment> Env;
-  IPtr<IComponentDesigner> Designer;
-};
-std::unique_ptr<TDesignRun> Run;
+using bench::Run;
 
 /// A module open for the length of a scope.
 struct TOpenModule {
@@ -62,15 +52,15 @@ struct TOpenModule {
 };
 
 TOpenModule NewModule(const String& Name, const String& AncestorName) {
-  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(Name + ".kfm", &Run->Log);
-  return TOpenModule(Run->Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
+  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(Name + ".kfm", &Run().Log);
+  return TOpenModule(Run().Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), Name + ".kfm", false, Name,
                                                AncestorName, "", nullptr, ""));
 }
 
 /// Runs `Step` each iteration (the host's log is emptied between steps, untimed) and
 /// reports `x_base` against `BaseSeconds`.
 void Report(benchmark::State& State, double BaseSeconds, const std::function<void()>& Step) {
-  bench::ReportAgainstBase(State, BaseSeconds, Step, [] { Run->Log.Clear(); });
+  bench::ReportAgainstBase(State, BaseSeconds, Step, [] { Run().Log.Clear(); });
 }
 
 /// Module Form1 with `Count` buttons named Button1..ButtonCount.
@@ -82,7 +72,7 @@ TOpenModule ButtonModule(int Count) {
     Button->SetName("Button" + IntToStr(I));
     Button->SetParent(Root);
   }
-  Run->Log.Clear();
+  Run().Log.Clear();
   return Form;
 }
 
@@ -147,7 +137,7 @@ void BM_RenameThroughFamily(benchmark::State& State) {
     Flip = !Flip;
     for (TComponent* B : PlainButtons) B->SetName(Flip ? "Renamed1" : "Button1");
   });
-  Run->Log.Clear();
+  Run().Log.Clear();
   Flip = false;
   Report(State, Base, [&] {
     Flip = !Flip;
@@ -200,21 +190,4 @@ BENCHMARK(BM_AncestorChange)->ArgNames({"descendants"})->Arg(1)->Arg(10)->Arg(50
 
 } // namespace
 
-int main(int argc, char** argv) {
-  StartDesignCore();
-  RegisterKilnDesignPackage();
-  Run = std::make_unique<TDesignRun>();
-  Run->Env = New<fakes::TRecordingEnvironment>(&Run->Log);
-  InitializeDesigners(InterfaceOf<IDesignEnvironment>(Run->Env.Get()));
-  Run->Designer = Designers()->DesignerFromExtension(".kfm");
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  benchmark::RunSpecifiedBenchmarks();
-  benchmark::Shutdown();
-  Designers()->UnregisterDesigner(Run->Designer);
-  Run.reset();
-  GetPPIForKilnDesignerForIItemFunc = nullptr;
-  StopDesignCore();
-  FinalizeKiln();
-  return 0;
-}
+int main(int argc, char** argv) { return bench::RunWithKilnDesigner(argc, argv); }

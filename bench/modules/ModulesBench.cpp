@@ -20,13 +20,9 @@
 //
 //===----------------------------------------------------------------------===//
 #include "bench/BenchTiming.h"
-#include "core/DesignCore.h"
-#include "core/Designers.h"
+#include "bench/KilnDesignRun.h"
 #include "core/root/ComponentRoot.h"
-#include "frameworks/kiln/Kiln.h"
-#include "frameworks/kiln/design/KilnDesign.h"
 #include "platform/Filer.h"
-#include "tests/fakes/RecordingEnvironment.h"
 #include "tests/fakes/RecordingModule.h"
 
 #include <benchmark/benchmark.h>
@@ -41,32 +37,32 @@ namespace {
 using bench::BestOf;
 using bench::SecondsOf;
 
-struct TDesignRun {
-  fakes::TCallLog Log;
-  IPtr<fakes::TRecordingEnvironment> Env;
-  IPtr<IComponentDesigner> Designer;
-  std::filesystem::path Dir;
-};
-std::unique_ptr<TDesignRun> Run;
+using bench::Run;
+
+/// The scratch directory of the run's modules.
+std::filesystem::path& Dir() {
+  static std::filesystem::path Path;
+  return Path;
+}
 
 enum TShape { shFlat, shNested, shDescendant };
 
-String PathOf(const String& Name) { return (Run->Dir / (Name + ".kfm")).string(); }
+String PathOf(const String& Name) { return (Dir() / (Name + ".kfm")).string(); }
 
 TComponentRoot* RootOf(const IPtr<IRoot>& Root) {
   return dynamic_cast<TComponentRoot*>(QueryAs<IInternalRoot>(Root)->Implementor());
 }
 
 IPtr<IRoot> NewModule(const String& Name, const String& Ancestor) {
-  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(PathOf(Name), &Run->Log);
-  return Run->Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), PathOf(Name), false, Name, Ancestor, "",
+  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(PathOf(Name), &Run().Log);
+  return Run().Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), PathOf(Name), false, Name, Ancestor, "",
                                    nullptr, "");
 }
 
 IPtr<IRoot> OpenModule(const String& Name, const String& AncestorClass) {
-  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(PathOf(Name), &Run->Log);
+  IPtr<fakes::TRecordingModule> Module = New<fakes::TRecordingModule>(PathOf(Name), &Run().Log);
   Module->AncestorClassName = AncestorClass;
-  return Run->Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), PathOf(Name), true, "", "", "", nullptr,
+  return Run().Designer->CreateRoot(InterfaceOf<IDesignerModule>(Module.Get()), PathOf(Name), true, "", "", "", nullptr,
                                    "");
 }
 
@@ -182,7 +178,7 @@ void BM_Open(benchmark::State& State) {
       [&] {
         Open->Close();
         Open = nullptr;
-        Run->Log.Clear();
+        Run().Log.Clear();
       });
   State.counters["x_plain_read"] = State.counters["x_base"] * Base / Plain;
 }
@@ -205,7 +201,7 @@ void BM_Save(benchmark::State& State) {
         RootOf(Open)->Modified();
         Open->Save();
       },
-      [&] { Run->Log.Clear(); });
+      [&] { Run().Log.Clear(); });
   Open->Close();
 }
 
@@ -222,24 +218,9 @@ BENCHMARK(BM_Save)->Apply(Shapes);
 } // namespace
 
 int main(int argc, char** argv) {
-  StartDesignCore();
-  RegisterKilnDesignPackage();
-  Run = std::make_unique<TDesignRun>();
-  Run->Env = New<fakes::TRecordingEnvironment>(&Run->Log);
-  Run->Env->Options.UseDesignerGuidelines = false;
-  InitializeDesigners(InterfaceOf<IDesignEnvironment>(Run->Env.Get()));
-  Run->Designer = Designers()->DesignerFromExtension(".kfm");
   char Template[] = "/tmp/fk-bench-modules-XXXXXX";
-  Run->Dir = ::mkdtemp(Template);
-  benchmark::Initialize(&argc, argv);
-  if (benchmark::ReportUnrecognizedArguments(argc, argv)) return 1;
-  benchmark::RunSpecifiedBenchmarks();
-  benchmark::Shutdown();
-  std::filesystem::remove_all(Run->Dir);
-  Designers()->UnregisterDesigner(Run->Designer);
-  Run.reset();
-  GetPPIForKilnDesignerForIItemFunc = nullptr;
-  StopDesignCore();
-  FinalizeKiln();
-  return 0;
+  Dir() = ::mkdtemp(Template);
+  int Code = bench::RunWithKilnDesigner(argc, argv);
+  std::filesystem::remove_all(Dir());
+  return Code;
 }
