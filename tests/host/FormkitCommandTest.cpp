@@ -119,6 +119,25 @@ TEST_F(FormkitCommandTest, TheDemoDesignsByHandAndItsFilesReopenAsTheyWereLeft) 
   EXPECT_EQ(Read(At("Frame1.kfm")), Frame) << "opened and saved without an edit: the same bytes";
 }
 
+TEST_F(FormkitCommandTest, RenderDrawsTheModuleAtItsSizeWithTheSelection) {
+  ASSERT_EQ(Run({"render", At("Form1.kfm"), At("Form1.png"), "--select", "Button1", "Label1"}), feOK) << Err.str();
+  String Png = Read(At("Form1.png"));
+  ASSERT_GT(Png.size(), 24u);
+  EXPECT_EQ(Png.substr(1, 3), "PNG");
+  auto BigEndian = [&](std::size_t At) {
+    return (unsigned(std::uint8_t(Png[At])) << 24) | (unsigned(std::uint8_t(Png[At + 1])) << 16) |
+           (unsigned(std::uint8_t(Png[At + 2])) << 8) | unsigned(std::uint8_t(Png[At + 3]));
+  };
+  EXPECT_EQ(BigEndian(16), 480u) << "the form's client width";
+  EXPECT_EQ(BigEndian(20), 320u) << "the form's client height";
+  ASSERT_EQ(Run({"render", At("Form1.kfm"), At("Form1.svg")}), feOK) << Err.str();
+  EXPECT_NE(Read(At("Form1.svg")).find("<g id=\"Button1\" class=\"TButton\""), String::npos);
+  EXPECT_EQ(Run({"render", At("Form1.kfm"), At("Form1.bmp")}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit render: Cannot render to \"" + At("Form1.bmp") +
+                           "\": the file name must end in .png or .svg\n");
+  EXPECT_FALSE(fs::exists(At("Form1.bmp")));
+}
+
 TEST_F(FormkitCommandTest, HelpAndUsageErrorsExitWithTwo) {
   EXPECT_EQ(Run({"--help"}), feOK);
   EXPECT_NE(Out.str().find("Exit codes: 0 done;"), String::npos);
