@@ -1,6 +1,7 @@
 //===- frameworks/kiln/Kiln.cpp - Starting and stopping the framework ----===//
 #include "frameworks/kiln/Kiln.h"
 
+#include "frameworks/kiln/KilnDockTabs.h"
 #include "frameworks/kiln/KilnSplitters.h"
 #include "frameworks/kiln/KilnToolBars.h"
 
@@ -16,7 +17,8 @@ std::vector<TClass> KilnClasses() {
           TCustomFrame::StaticClass(), TFrame::StaticClass(),      TDataModule::StaticClass(),
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
           TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass(),
-          TStatusBar::StaticClass(),   TToolBar::StaticClass(),    TSplitter::StaticClass()};
+          TStatusBar::StaticClass(),   TToolBar::StaticClass(),    TSplitter::StaticClass(),
+          TDockTabSet::StaticClass()};
 }
 } // namespace
 

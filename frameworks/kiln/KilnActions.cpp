@@ -116,6 +116,11 @@ void TMenuItem::Notification(TComponent* AComponent, TOperation Operation) {
 
 FK_IMPLEMENT(TPopupMenu, "KilnMenus") {}
 
+void TPopupMenu::Popup(int X, int Y) {
+  FPopupPoint = Point(X, Y);
+  ++FPopupCount;
+}
+
 void TPopupMenu::Create(TComponent* AOwner) {
   inherited::Create(AOwner);
   FItems = CreateComponentOf<TMenuItem>(this);

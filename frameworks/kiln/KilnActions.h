@@ -41,6 +41,9 @@ class FK_API TAction : public TComponent {
   void SetChecked(bool Value) noexcept { FChecked = Value; }
   bool Enabled() const noexcept { return FEnabled; }
   void SetEnabled(bool Value) noexcept { FEnabled = Value; }
+  /// Whether menu items and buttons of the action show; a hidden action still runs.
+  bool Visible() const noexcept { return FVisible; }
+  void SetVisible(bool Value) noexcept { FVisible = Value; }
   /// The list the action belongs to; not owned.
   TActionList* ActionList() const noexcept { return FActionList; }
   void SetActionList(TActionList* Value);
@@ -59,6 +62,7 @@ private:
   String FHint;
   bool FChecked = false;
   bool FEnabled = true;
+  bool FVisible = true;
   TActionList* FActionList = nullptr;
 };
 
@@ -122,9 +126,16 @@ class FK_API TPopupMenu : public TComponent {
   FK_CLASS(TPopupMenu, TComponent)
   void Create(TComponent* AOwner) override;
   TMenuItem* Items() const noexcept { return FItems; }
+  /// Pops the menu up at the screen point (`X`, `Y`): here the point is recorded and
+  /// the count of popups grows.
+  void Popup(int X, int Y);
+  TPoint PopupPoint() const noexcept { return FPopupPoint; }
+  int PopupCount() const noexcept { return FPopupCount; }
 
 private:
   TMenuItem* FItems = nullptr;
+  TPoint FPopupPoint;
+  int FPopupCount = 0;
 };
 
 } // namespace formkit

@@ -1,6 +1,8 @@
 //===- frameworks/kiln/KilnControls.cpp - Controls and windowed controls -===//
 #include "frameworks/kiln/KilnControls.h"
 
+#include "frameworks/kiln/KilnDragDock.h"
+
 #include "platform/Filer.h"
 
 #include <algorithm>
@@ -243,6 +245,7 @@ void TControl::WndProc(TMessage& Message) {
   switch (Message.Msg) {
   case CM_FONTCHANGED: FontChanged(); break;
   case CM_TEXTCHANGED: TextChanged(); break;
+  case CM_VISIBLECHANGED: detail::SendDockNotification(this, TDockNotifyKind::VisibleChanged); break;
   default: break;
   }
 }
@@ -509,6 +512,7 @@ void TWinControl::WndProc(TMessage& Message) {
 void TWinControl::Resized() {
   inherited::Resized();
   Realign();
+  if (IPtr<IDockZones> Zones; Supports(DockManager(this), Zones)) Zones->ResetBounds(false);
 }
 
 void TWinControl::FontChanged() {

@@ -51,6 +51,19 @@ int ProcessMessages() {
   return Count;
 }
 
+bool PeekMessage(TMessageTarget*& Target, TMessage& Message, std::uint32_t MsgFilterMin, std::uint32_t MsgFilterMax,
+                 bool Remove) {
+  auto& Queue = MessageQueue();
+  auto It = std::find_if(Queue.begin(), Queue.end(), [&](const TQueuedMessage& Q) {
+    return Q.Message.Msg == WM_QUIT || (Q.Message.Msg >= MsgFilterMin && Q.Message.Msg <= MsgFilterMax);
+  });
+  if (It == Queue.end()) return false;
+  Target = It->Target;
+  Message = It->Message;
+  if (Remove) Queue.erase(It);
+  return true;
+}
+
 int RemoveMessages(TMessageTarget* Target) noexcept {
   auto& Queue = MessageQueue();
   auto Before = Queue.size();

@@ -36,6 +36,8 @@ enum : std::uint32_t {
   WM_NULL = 0x0000,
   WM_SIZE = 0x0005,
   WM_CLOSE = 0x0010,
+  /// The program is asked to end; `PeekMessage` finds it whatever the filter.
+  WM_QUIT = 0x0012,
   WM_TIMER = 0x0113,
   /// The first number free for a program's own messages.
   WM_USER = 0x0400,
@@ -84,6 +86,11 @@ FK_API void PostMessage(TMessageTarget* Target, std::uint32_t Msg, std::intptr_t
 FK_API int ProcessMessages();
 /// Delivers the first queued message, if any; true when one was delivered.
 FK_API bool HandleMessage();
+/// Finds the first queued message whose number lies in [`MsgFilterMin`, `MsgFilterMax`]
+/// (or that is `WM_QUIT`), into `Target` and `Message`; with `Remove` it leaves the queue
+/// undelivered. False when there is none.
+FK_API bool PeekMessage(TMessageTarget*& Target, TMessage& Message, std::uint32_t MsgFilterMin,
+                        std::uint32_t MsgFilterMax, bool Remove);
 /// Drops every queued message for `Target`; returns how many were dropped.
 FK_API int RemoveMessages(TMessageTarget* Target) noexcept;
 /// The number of queued messages, for `Target` alone or for all when it is null.

@@ -33,8 +33,13 @@ public:
     auto It = Extras.find(Control);
     if (It == Extras.end() || !It->second.Host) return;
     auto Site = Extras.find(It->second.Host);
-    if (Site != Extras.end()) std::erase(Site->second.Clients, Control);
     It->second.Host = nullptr;
+    if (Site == Extras.end()) return;
+    std::erase(Site->second.Clients, Control);
+    // The zones go with the client list. This runs where nothing can be reported (a
+    // control that goes); a layout that fails there leaves the other clients unmoved.
+    if (IPtr<IDockZones> Zones; Supports(Site->second.Manager, Zones))
+      RunIgnoringExceptions([&] { Zones->RemoveControl(Control); });
   }
 
 protected:
@@ -43,9 +48,10 @@ protected:
     auto* C = dynamic_cast<TControl*>(AComponent);
     if (Operation != opRemove || !C) return;
     if (C == Focus) Focus = nullptr;
-    auto It = Extras.find(C);
-    if (It == Extras.end()) return;
+    if (!Extras.contains(C)) return;
     Undock(C);
+    // Found again: the site's manager lays its zones out on the way, which may add entries.
+    auto It = Extras.find(C);
     // A site that goes leaves its clients floating.
     for (TControl* Client : It->second.Clients) Extras[Client].Host = nullptr;
     Extras.erase(It);

@@ -25,6 +25,9 @@ struct TWindowExtras {
   TWinControl* Host = nullptr;
   std::vector<TControl*> Clients;
   IPtr<IDockManager> Manager;
+  /// The size remembered for docking along an edge; 0 while none is.
+  int LRDockWidth = 0;
+  int TBDockHeight = 0;
 };
 
 /// The entry of `Control`, made on first use.
