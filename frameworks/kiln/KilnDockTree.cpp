@@ -226,8 +226,8 @@ void TDockTree::Layout(TDockZone* Zone, const TRect& R) {
     Cum += Shown[I]->FShare;
     int To = Start + static_cast<int>(std::lround(Sum > 0 ? Room * Cum / Sum : 0)) + static_cast<int>(I) * FBorderWidth;
     if (I + 1 == Shown.size()) To = Start + Total;
-    TRect Part = Across ? Rect(From, R.Top, std::max(From, To), R.Bottom) : Rect(R.Left, From, R.Right, std::max(From, To));
-    Layout(Shown[I], Part);
+    TRect Slice = Across ? Rect(From, R.Top, std::max(From, To), R.Bottom) : Rect(R.Left, From, R.Right, std::max(From, To));
+    Layout(Shown[I], Slice);
   }
 }
 
