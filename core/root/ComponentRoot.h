@@ -148,7 +148,7 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   bool ModifiableFrame(TComponent* Component) const { return IsModifiableFrame(Component); }
   IPtr<IRoot> AsRoot() { return IPtr<IRoot>(static_cast<IInternalRoot*>(this)); }
 
-  // Lifecycle and state (Part of this unit) ---------------------------------------------
+  // Lifecycle and state -------------------------------------------------------------------
   TClass GetRootClass() override;
   String GetDesignClassName();
   String GetAncestorName();
