@@ -596,6 +596,9 @@ void InstallUpdateManagerHooks() {
   TRootHooks::UpdateManagerModified = [](const IPtr<IUpdateManager>& M) {
     if (TUpdateManager* Found = Manager(M)) Found->Modified();
   };
+  TRootHooks::UpdateManagerUpdate = [](const IPtr<IUpdateManager>& M) {
+    if (TUpdateManager* Manager = TUpdateManager::ManagerOf(QueryAs<IInterface>(M))) Manager->Update();
+  };
   TRootHooks::UpdateManagerRemoved = [](const IPtr<IUpdateManager>& M, TPersistent* Instance) {
     if (TUpdateManager* Found = Manager(M)) Found->Notification(Instance, opRemove);
   };
@@ -629,6 +632,7 @@ void InstallUpdateManagerHooks() {
 void RemoveUpdateManagerHooks() {
   TRootHooks::CreateUpdateManager = nullptr;
   TRootHooks::UpdateManagerModified = nullptr;
+  TRootHooks::UpdateManagerUpdate = nullptr;
   TRootHooks::UpdateManagerRemoved = nullptr;
   TRootHooks::UpdateManagerNameExists = nullptr;
   TRootHooks::UpdateManagerComponent = nullptr;

@@ -24,6 +24,7 @@
 #pragma once
 
 #include "core/DesignerTypes.h"
+#include "core/ToolServices.h"
 #include "core/root/ComponentDesignSurface.h"
 #include "core/root/RootHooks.h"
 #include "core/root/RootNames.h"
@@ -69,6 +70,16 @@ enum TRecoveryResult : std::uint8_t {
 /// The answer to a yes/no/cancel question.
 enum TQueryRedirectLinksResult : std::uint8_t { qrYes, qrNo, qrCancel };
 
+/// The answer to the warning that reverting a component deletes what the ancestor lacks.
+enum TDeleteWarnResult : std::uint8_t { dwYes, dwNo, dwCancel };
+
+/// Mirrors the children of a module right to left.
+struct FK_API IFlipChildren : IInterface {
+  FK_INTERFACE(IFlipChildren, IInterface, "{EC71B51F-B812-42B2-865B-44E7819686F7}")
+  /// `Value` false flips every child of the root; true only the selected ones.
+  virtual void FlipChildren(bool Value) = 0;
+};
+
 /// A palette entry that can make its component.
 struct FK_API IInternalPaletteItem : IInterface {
   FK_INTERFACE(IInternalPaletteItem, IInterface, "{F9D448F1-50BC-11D1-9FB5-0020AF3D82DA}")
@@ -112,9 +123,13 @@ private:
 };
 
 /// One module on design. See the file comment.
-class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, public IDesigner {
+class FK_API TComponentRoot : public TInterfacedObject,
+                              public IInternalRoot,
+                              public IDesigner,
+                              public IOTAAlignable,
+                              public IFlipChildren {
   FK_CLASS(TComponentRoot, TInterfacedObject)
-  FK_INTERFACES(IInternalRoot, IDesigner)
+  FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren)
 
   /// What a module on design is made from.
   struct TCreateArgs {
@@ -379,6 +394,27 @@ class FK_API TComponentRoot : public TInterfacedObject, public IInternalRoot, pu
   /// no newer image; false when the lender must free it.
   [[nodiscard]] bool TakeBackRootStream(TMemoryStream* Image, int ModifyTime) noexcept;
 
+  // Positioning the selection ----------------------------------------------------------------
+  /// Lines up, spaces, centres or reorders the selection, relative to its first item.
+  /// Nothing while the root is selected or the controls are locked.
+  void Align(TOTAAffect Affect) override;
+  /// Sizes the selection: to the largest, the smallest, the first item's, or `Value`.
+  void Size(TOTASizeAffect Affect, int Value) override;
+  /// Moves each selected item's top left corner onto the grid.
+  void AlignToGrid();
+  void BringToFront() { ZOrder(true); }
+  void SendToBack() { ZOrder(false); }
+  void ZOrder(bool Front);
+  /// Selects every component of the module that has an icon or a place on the surface.
+  void SelectAll();
+  /// The host shows one of its design dialogs.
+  void Dialog(TDesignDialog Kind);
+  void Command(TDesignCommand Kind);
+  void FlipChildren(bool Value) override { FlipRootChildren(!Value); }
+  /// Whether the revert command is offered: an inherited component is selected, the
+  /// module has no descendants, and the root is not selected.
+  [[nodiscard]] bool CanRevert();
+
   // Clipboard and deletion ----------------------------------------------------------------
   /// Writes the selection as a selection stream: a bounding rectangle when `WithRect`,
   /// the components, and with `WithMethods` the source of their handlers.
@@ -545,6 +581,10 @@ protected:
   virtual void AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) = 0;
   /// After the construction of a root instance failed or its read failed.
   virtual void RootCreationFailed() {}
+  /// Asks whether reverting `ComponentName` may delete its own children `Names`.
+  virtual TDeleteWarnResult AskDeleteWarning(const String& ComponentName, const String& Names) = 0;
+  /// Mirrors the children of the root (`AllChildren`) or of the selection, right to left.
+  virtual void FlipRootChildren(bool AllChildren) = 0;
 
   // State -------------------------------------------------------------------------------
   IPtr<IInternalComponentDesigner> FDesigner;
@@ -631,6 +671,9 @@ private:
   /// Reads the method text of a paste after the reader's position, up to a zero byte.
   [[nodiscard]] static String ReadMethodText(TReader* Reader);
   void CheckFixups();
+  void RevertComponents();
+  /// The selected items of the surface, in selection order.
+  [[nodiscard]] std::vector<IPtr<IItem>> SelectedItems();
   void CollectLinks(TComponent* Instance);
   [[nodiscard]] int WriteModuleFile(TStream* Image, int Stamp, int DiskAge);
   void RenameModuleFile(const String& OldName, const String& NewName);

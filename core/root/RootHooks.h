@@ -76,6 +76,10 @@ struct FK_API TRootHooks {
   static std::function<void(TComponent* Instance, TClass ProxyClass)> ChangeToProxyClass;
   /// Raises when a module cannot inherit from `Ancestor`.
   static std::function<void(TComponentRoot& Root, TComponent* Ancestor)> ValidateInheritence;
+  /// Brings a module up to date with its ancestor (the manager's `Update`).
+  static std::function<void(const IPtr<IUpdateManager>& Manager)> UpdateManagerUpdate;
+  /// Hands a named command to the host's designer command service.
+  static std::function<void(const String& Command)> SendDesignerCommand;
   /// Calls `Proc` with the units the selection editors of `Component` ask for.
   static std::function<void(TComponentRoot& Root, TComponent* Component, const TGetStrProc& Proc)>
       SelectionEditorUnits;

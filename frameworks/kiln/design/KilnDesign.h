@@ -216,6 +216,8 @@ class FK_API TKilnRoot : public TComponentRoot {
       RedirectLinksAnswer;
   /// The module the links go to instead; empty removes them.
   static inline std::function<String(TComponent* Root, const String& LinkedName)> RedirectTarget;
+  /// Answers whether reverting a component may delete its own children.
+  static inline std::function<TDeleteWarnResult(const String& ComponentName, const String& Names)> DeleteWarningAnswer;
   /// The window that shows the module.
   TCustomForm* DesignWindow() const noexcept { return FWindow; }
 
@@ -249,6 +251,10 @@ protected:
   /// Frames nest in forms and in other frames.
   bool CanNestClass(TClass Class) override;
   TClass GetClassGroup() override;
+  TDeleteWarnResult AskDeleteWarning(const String& ComponentName, const String& Names) override;
+  /// Mirrors controls right to left in their parents: every control of the form, or the
+  /// children of each selected container.
+  void FlipRootChildren(bool AllChildren) override;
   /// Moves a pasted control by what moves the selection's bounds to `Rect`'s top left;
   /// nothing when either is empty or the control is not on the top of the paste.
   void AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) override;

@@ -189,6 +189,34 @@ void TKilnRoot::AdjustReadComponent(TComponent* Component, const TRect& Rect, co
                            (static_cast<std::int32_t>(static_cast<std::uint16_t>(Top + DY)) << 16));
 }
 
+TDeleteWarnResult TKilnRoot::AskDeleteWarning(const String& ComponentName, const String& Names) {
+  return DeleteWarningAnswer ? DeleteWarningAnswer(ComponentName, Names) : dwCancel;
+}
+
+namespace {
+/// Mirrors the children of `Parent` within its client width; with `AllLevels` their
+/// children too.
+void MirrorChildren(TWinControl* Parent, bool AllLevels) {
+  int Width = Parent->ClientWidth();
+  for (int I = 0; I < Parent->ControlCount(); ++I) {
+    TControl* C = Parent->Controls(I);
+    C->SetBounds(Width - C->Left() - C->Width(), C->Top(), C->Width(), C->Height());
+    if (auto* W = dynamic_cast<TWinControl*>(C); W && AllLevels) MirrorChildren(W, true);
+  }
+}
+} // namespace
+
+void TKilnRoot::FlipRootChildren(bool AllChildren) {
+  if (AllChildren) {
+    if (auto* Form = dynamic_cast<TWinControl*>(FRoot)) MirrorChildren(Form, true);
+  } else {
+    IPtr<IDesignerSelections> Selected = GetSelection();
+    for (int I = 0; I < Selected->GetCount(); ++I)
+      if (auto* W = dynamic_cast<TWinControl*>(Selected->Get(I))) MirrorChildren(W, false);
+  }
+  Modified();
+}
+
 TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root) {
   auto Internal = QueryAs<IInternalRoot>(Root);
   auto* Kiln = Internal ? dynamic_cast<TKilnRoot*>(Internal->Implementor()) : nullptr;
