@@ -178,7 +178,7 @@ TDesignSession::TDesignSession() {
 
 TDesignSession::~TDesignSession() {
   for (auto It = FModules.rbegin(); It != FModules.rend(); ++It)
-    if ((*It)->GetRoot()) RunIgnoringExceptions([&] { (*It)->Close(); });
+    if ((*It)->GetRoot() || QueryAs<IInternalRoot>(*It)->IsDormant()) RunIgnoringExceptions([&] { (*It)->Close(); });
   FModules.clear();
   FRecords.clear();
   if (FDesigner) Designers()->UnregisterDesigner(FDesigner);

@@ -188,6 +188,7 @@ TClass TComponentRoot::GetRootClass() {
 }
 
 String TComponentRoot::GetDesignClassName() {
+  Resurrect(); // the class data must be live
   if (AnsiStartsText("TFORM", FRootBaseClass)) {
     TCustomModuleReg* Reg = FindCustomModuleReg([&](TCustomModuleReg* R) {
       return SameText(R->FBaseClass->ClassName, FRootBaseClass) && FDesigner->SupportsRootClass(R->FBaseClass);

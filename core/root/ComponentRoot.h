@@ -446,6 +446,8 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void Save() override;
   IPtr<IDesignerModule> GetModule() override { return FModule; }
   TComponent* GetRoot() override { return FRoot; }
+  /// Gives up the live components, the surface and the update managers, keeping the
+  /// module's stream. Not for a module that is dormant already.
   void GoDormant() override;
   void ShowHelp() override;
   IPtr<IDesigner> GetDesigner() override { return AsDesigner(); }
@@ -470,7 +472,9 @@ class FK_API TComponentRoot : public TInterfacedObject,
   bool IsDormant() override { return FDormantStream != nullptr; }
   void PasteSelectionFromStream(TStream* Stream, TComponent* Parent, const TRect& Rect) override;
   void RemoveDependenciesOn(TComponent* Component) override;
-  void Resurrect() override {}
+  /// Brings a dormant module back from its stream; nothing for a live one. A failed read
+  /// passes on and leaves the module dormant with its stream.
+  void Resurrect() override;
   void SetActiveView(const IPtr<IRoot>&) override {}
   IPtr<IRoot> GetAncestorRoot() override { return IPtr<IRoot>(FAncestorRoot); }
   void CancelModes() override;
@@ -647,6 +651,7 @@ protected:
   bool FClosing = false;
   bool FGeneratePreview = true;
   bool FInUndo = false;
+  bool FResurrecting = false;
 
 private:
   void CreateNewModule(const TCreateArgs& Args);
@@ -672,6 +677,8 @@ private:
   [[nodiscard]] static String ReadMethodText(TReader* Reader);
   void CheckFixups();
   void RevertComponents();
+  /// Brings back the dormant modules that `Root`'s unresolved references name.
+  void ResurrectDependentModules(TComponent* Root);
   /// The selected items of the surface, in selection order.
   [[nodiscard]] std::vector<IPtr<IItem>> SelectedItems();
   void CollectLinks(TComponent* Instance);

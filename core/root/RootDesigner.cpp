@@ -120,7 +120,6 @@ void TComponentRoot::ShowHelp() {}
 // Files, views, streams: joining with their own units
 //===----------------------------------------------------------------------===//
 
-void TComponentRoot::GoDormant() { RaiseServiceNotAvailable("Keeping a module dormant"); }
 
 IPtr<IRoot> TComponentRoot::GetView(int Index) { throw EListError(SListIndexError, Index); }
 

@@ -59,7 +59,7 @@ struct KilnDesignFixture : ::testing::Test {
   void TearDown() override {
     // Last opened, first closed: a module that nests another goes before the one it nests.
     for (auto R = Open.rbegin(); R != Open.rend(); ++R)
-      if ((*R)->GetRoot()) (*R)->Close();
+      if ((*R)->GetRoot() || QueryAs<IInternalRoot>(*R)->IsDormant()) (*R)->Close();
     Open.clear();
     EXPECT_EQ(ProxyClassCount(), 0) << "a closed module's class outlived it";
     if (Designer) Designers()->UnregisterDesigner(Designer);
