@@ -6,6 +6,7 @@
 #include "host/DesignHost.h"
 #include "platform/FormatSettings.h"
 #include "platform/ScopeGuard.h"
+#include "platform/TypInfo.h"
 
 #include <filesystem>
 #include <fstream>
@@ -28,6 +29,7 @@ FK_RESOURCESTRING(sUnknownKey, "unknown key '%s'");
 FK_RESOURCESTRING(sUnknownClass, "Class %s not found");
 FK_RESOURCESTRING(sNoModuleNamed, "no open module is named '%s'");
 FK_RESOURCESTRING(sExpectation, "%s shows '%s', not '%s'");
+FK_RESOURCESTRING(sUnknownHow, "unknown way '%s'");
 
 //===----------------------------------------------------------------------===//
 // Properties by path
@@ -167,6 +169,17 @@ public:
     } else if (Verb == "undelete") {
       Root()->Activate();
       Root()->DoUndelete();
+    } else if (Verb == "align") {
+      Need(1, "HOW");
+      Root()->Align(static_cast<TOTAAffect>(EnumOf(TypeInfo<TOTAAffect>(), "af", Words[1])));
+    } else if (Verb == "size") {
+      Need(1, "HOW");
+      Root()->Size(static_cast<TOTASizeAffect>(EnumOf(TypeInfo<TOTASizeAffect>(), "as", Words[1])),
+                   Words.size() > 2 ? Number(Words[2]) : 0);
+    } else if (Verb == "flip") {
+      Root()->FlipChildren(!(Words.size() > 1 && SameText(Words[1], "all")));
+    } else if (Verb == "revert") {
+      Root()->Command(dmRevert);
     } else if (Verb == "save") {
       Save(Current());
     } else if (Verb == "saveas") {
@@ -195,6 +208,12 @@ private:
   static int Number(const String& Text) {
     int Value = 0;
     if (!TryStrToInt(Text, Value)) throw EHostError(sNotANumber, Text);
+    return Value;
+  }
+  /// The value of enumeration `Info` named `Prefix` + `Name`, without regard to case.
+  static int EnumOf(PTypeInfo Info, const char* Prefix, const String& Name) {
+    int Value = GetEnumValue(Info, Prefix + Name);
+    if (Value < 0) throw EHostError(sUnknownHow, Name);
     return Value;
   }
   static TShiftState ShiftOf(const std::vector<String>& Words, std::size_t From) {

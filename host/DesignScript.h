@@ -43,6 +43,15 @@ namespace formkit {
   "  bind NAME.EVENT HANDLER   binds an event to a handler, made in the source if new\n"          \
   "  rename NAME NEWNAME       renames a component\n"                                               \
   "  copy | cut | paste [X Y] | delete | undelete   the clipboard and deletion\n"                 \
+  "  align HOW                 lines up the selection on its first item: left, right, top,\n"       \
+  "                            bottom, hcenter, vcenter, hspace, vspace, hwincenter,\n"           \
+  "                            vwincenter, hspaceinc, hspacedec, hspacedel, vspaceinc,\n"         \
+  "                            vspacedec, vspacedel, aligntogrid, snaptogrid, sendtoback,\n"      \
+  "                            bringtofront\n"                                                     \
+  "  size HOW [VALUE]          sizes the selection: hgrow, hshrink, habsolute, vgrow,\n"          \
+  "                            vshrink, vabsolute, widths, heights, widthheight\n"                 \
+  "  flip [all]                mirrors the selected containers' children (all: the form's)\n"     \
+  "  revert                    gives the selected inherited components back their ancestor's\n"  \
   "  save | saveas FILE        writes the current module and its source\n"                         \
   "  close                     closes the current module\n"                                         \
   "  expect NAME.PROP VALUE    stops the script unless the property shows VALUE\n"

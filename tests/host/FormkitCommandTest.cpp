@@ -138,6 +138,25 @@ TEST_F(FormkitCommandTest, RenderDrawsTheModuleAtItsSizeWithTheSelection) {
   EXPECT_FALSE(fs::exists(At("Form1.bmp")));
 }
 
+TEST_F(FormkitCommandTest, ScriptsLineUpSizeAndMirrorTheSelection) {
+  WriteScript("line.design", "open " + At("Form1.kfm") +
+                                 "\nselect Button2 Button1\n"
+                                 "align top\n"
+                                 "align hspacedel\n"
+                                 "expect Button1.Left 309\n"
+                                 "size habsolute 60\n"
+                                 "expect Button1.Width 60\n"
+                                 "flip all\n"
+                                 "expect Button2.Left 36\n"
+                                 "save\n"
+                                 "align diagonal\n");
+  auto Before = Files();
+  EXPECT_EQ(Run({"run", At("line.design")}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit run: " + At("line.design") + ":11: unknown way 'diagonal'\n");
+  EXPECT_NE(Out.str().find("9: expect Button2.Left 36\n"), String::npos) << Out.str();
+  EXPECT_EQ(Files(), Before) << "the save of line 10 was taken back";
+}
+
 TEST_F(FormkitCommandTest, HelpAndUsageErrorsExitWithTwo) {
   EXPECT_EQ(Run({"--help"}), feOK);
   EXPECT_NE(Out.str().find("Exit codes: 0 done;"), String::npos);
