@@ -96,6 +96,9 @@ class FK_API TMenuItem : public TComponent {
   void SetCaption(const String& Value) { FCaption = Value; }
   bool Checked() const noexcept { return FAction ? FAction->Checked() : FChecked; }
   void SetChecked(bool Value) noexcept { FChecked = Value; }
+  /// Whether the entry can be chosen; not tied to the action.
+  bool Enabled() const noexcept { return FEnabled; }
+  void SetEnabled(bool Value) noexcept { FEnabled = Value; }
   /// The linked action; not owned, and dropped when it goes.
   TAction* Action() const noexcept { return FAction; }
   void SetAction(TAction* Value);
@@ -116,6 +119,7 @@ class FK_API TMenuItem : public TComponent {
 private:
   String FCaption;
   bool FChecked = false;
+  bool FEnabled = true;
   TAction* FAction = nullptr;
   TMenuItem* FParent = nullptr;
   std::vector<TMenuItem*> FItems;

@@ -244,7 +244,10 @@ void TControl::Click() {
 void TControl::WndProc(TMessage& Message) {
   switch (Message.Msg) {
   case CM_FONTCHANGED: FontChanged(); break;
-  case CM_TEXTCHANGED: TextChanged(); break;
+  case CM_TEXTCHANGED:
+    TextChanged();
+    detail::SendDockNotification(this, TDockNotifyKind::CaptionChanged);
+    break;
   case CM_VISIBLECHANGED: detail::SendDockNotification(this, TDockNotifyKind::VisibleChanged); break;
   default: break;
   }

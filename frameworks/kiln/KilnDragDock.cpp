@@ -11,6 +11,8 @@ namespace formkit {
 // Geometry
 //===----------------------------------------------------------------------===//
 
+int DragThreshold = 5;
+
 TRect ScreenBoundsOf(const TControl* Control) {
   if (!Control->Parent()) return Control->BoundsRect();
   TPoint P = Control->Parent()->ClientToScreen(Point(Control->Left(), Control->Top()));

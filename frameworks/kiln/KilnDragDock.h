@@ -32,8 +32,8 @@ FK_ENUM(TDragKind, std::uint8_t, dkDrag, dkDock)
 /// Whether a drag starts by itself when the mouse is pressed on the control.
 FK_ENUM(TDragMode, std::uint8_t, dmManual, dmAutomatic)
 
-/// What a dock notification reports of a client.
-enum class TDockNotifyKind : std::uint8_t { VisibleChanged };
+/// What a dock notification reports of a client: its visibility or its caption changed.
+enum class TDockNotifyKind : std::uint8_t { VisibleChanged, CaptionChanged };
 
 /// Asked whether a site accepts a drag, after the site's own answer.
 using TDockOverEvent = std::function<void(TObject* Sender, TDragDockObject* Source, int X, int Y, TDragState State,
@@ -168,6 +168,8 @@ FK_API void SetLRDockWidth(TControl* Control, int Value);
 FK_API void SetTBDockHeight(TControl* Control, int Value);
 /// The screen rectangle of a control: its bounds, moved by its parent's client origin.
 FK_API TRect ScreenBoundsOf(const TControl* Control);
+/// How far, in X or in Y, the mouse moves with a button down before a drag begins.
+FK_API extern int DragThreshold;
 /// The edge of `R` nearest to `P`, compared as fractions of the width and the height;
 /// ties go to left, top, right, bottom in that order. `alNone` when `P` is outside.
 FK_API TAlign NearestEdge(const TRect& R, TPoint P) noexcept;
