@@ -42,6 +42,9 @@ using TSaveDesktopProc = void (*)(TCustomIniFile* Desktop, bool AIsProject);
 //===----------------------------------------------------------------------===//
 
 /// Installs the focus hook that `GetTopWindow` reads. Calls nest.
+/// The pieces of `Text` between commas, empty ones included ("a,,b" gives three).
+[[nodiscard]] FK_API std::vector<String> SplitAtCommas(const String& Text);
+
 FK_API void InitializeDesktop();
 /// On the last matching call: removes the hook and frees the tables of design forms and
 /// default forms with their events.

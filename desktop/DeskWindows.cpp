@@ -77,6 +77,17 @@ FK_IMPLEMENT(TDesignFormTables, "DeskUtil") {}
 // Starting and stopping
 //===----------------------------------------------------------------------===//
 
+std::vector<String> SplitAtCommas(const String& Text) {
+  std::vector<String> Parts;
+  std::size_t Pos = 0;
+  while (Pos <= Text.size()) {
+    std::size_t Comma = std::min(Text.find(',', Pos), Text.size());
+    Parts.push_back(Text.substr(Pos, Comma - Pos));
+    Pos = Comma + 1;
+  }
+  return Parts;
+}
+
 void InitializeDesktop() {
   if (GDesktopStarts++ > 0) return;
   FocusHook = [](TCustomForm* Form) {

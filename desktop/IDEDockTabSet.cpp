@@ -1,6 +1,8 @@
 //===- desktop/IDEDockTabSet.cpp - The auto-hide strip of tool windows ---===//
 #include "desktop/IDEDockTabSet.h"
 
+#include "desktop/DeskUtil.h"
+
 #include "desktop/DockForm.h"
 #include "desktop/IDEDockPanel.h"
 
@@ -9,16 +11,6 @@ namespace formkit {
 FK_IMPLEMENT(TIDEDockTabSet, "IDEDockTabSet") {}
 
 namespace {
-std::vector<String> SplitAtCommas(const String& Text) {
-  std::vector<String> Parts;
-  std::size_t Pos = 0;
-  while (Pos <= Text.size()) {
-    std::size_t Comma = std::min(Text.find(',', Pos), Text.size());
-    Parts.push_back(Text.substr(Pos, Comma - Pos));
-    Pos = Comma + 1;
-  }
-  return Parts;
-}
 
 /// The tab of an entry's value; -1 for anything but a plain integer.
 int TabOf(const String& Value) {

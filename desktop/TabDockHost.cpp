@@ -1,5 +1,6 @@
 //===- desktop/TabDockHost.cpp - The host of tabbed tool windows ---------===//
 #include "desktop/DockHostForms.h"
+#include "desktop/DeskUtil.h"
 
 #include "frameworks/kiln/KilnWindows.h"
 
@@ -31,16 +32,6 @@ bool Within(const TControl* Inner, const TControl* Outer) {
   return false;
 }
 
-std::vector<String> SplitAtCommas(const String& Text) {
-  std::vector<String> Parts;
-  std::size_t Pos = 0;
-  while (Pos <= Text.size()) {
-    std::size_t Comma = std::min(Text.find(',', Pos), Text.size());
-    Parts.push_back(Text.substr(Pos, Comma - Pos));
-    Pos = Comma + 1;
-  }
-  return Parts;
-}
 } // namespace
 
 //===----------------------------------------------------------------------===//
