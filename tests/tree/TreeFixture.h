@@ -89,9 +89,18 @@ private:
 };
 
 struct TreeFixture : KilnDesignFixture {
+  /// Whether the Kiln package's own sprigs stay registered; without them the tree shows
+  /// what the core's default sprigs make of a module.
+  bool FrameworkSprigs = false;
+
   void SetUp() override {
     InitializeStructureTree();
     KilnDesignFixture::SetUp();
+    if (!FrameworkSprigs) {
+      detail::StopSprigRegistries();
+      detail::StartSprigRegistries();
+      detail::RegisterDefaultSprigs();
+    }
     InitDesignNotification();
   }
   void TearDown() override {

@@ -1,5 +1,6 @@
 //===- frameworks/kiln/design/KilnDesigner.cpp - The Kiln designer -------===//
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "frameworks/kiln/design/KilnSprigs.h"
 
 #include "core/Designers.h"
 #include "editors/EditorRegistry.h"
@@ -121,6 +122,7 @@ void RegisterKilnDesignPackage() {
   RegisterComponentGuidelines(TControl::StaticClass(), TControlGuidelines::StaticClass());
   RegisterComponentGuidelines(TWinControl::StaticClass(), TWinControlGuidelines::StaticClass());
   RegisterComponentGuidelines(TCustomForm::StaticClass(), TCustomFormGuidelines::StaticClass());
+  RegisterKilnSprigs();
   // Creation on a surface scales by the pixels per inch of the parent control.
   GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {
     auto* Control = dynamic_cast<TControl*>(ExtractComponent(Item));
