@@ -3,7 +3,7 @@
 // A module's context in a recording host view: selections travel both ways
 // without an echo, an empty view selection waits for the idle moment, only the
 // shown context follows the designer, the toolbar and the delete key answer by
-// the Part's table, and a context whose root is gone answers empty.
+// their table, and a context whose root is gone answers empty.
 //
 //===----------------------------------------------------------------------===//
 #include "tests/fakes/FakeRoot.h"

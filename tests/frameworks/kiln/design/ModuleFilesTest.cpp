@@ -4,7 +4,7 @@
 // again through the designer: trees and values come back, in binary and in
 // text; a file opened and saved unchanged keeps its bytes, and one edit changes
 // only its own lines; a descendant is saved as its difference and reopens over
-// its ancestor; saving asks what the Parts ask in their order and refuses
+// its ancestor; saving works in its order and refuses
 // read-only files; reading asks the user about errors and missing ancestors.
 //
 //===----------------------------------------------------------------------===//
