@@ -431,6 +431,9 @@ class FK_API TComponentRoot : public TInterfacedObject,
   /// A new stream of the components on the clipboard (component data or text); the
   /// caller frees it.
   [[nodiscard]] TMemoryStream* GetClipboardStream();
+  /// Reads the bounding rectangle a selection stream may start with; an empty rectangle
+  /// when the stream starts with a component.
+  static TRect ReadSelectionBounds(TReader* Reader);
   /// Whether `Text` starts, after blanks, with "object" or "inline" in any case.
   [[nodiscard]] static bool PossibleStream(std::string_view Text);
   bool IsFrame(TPersistent* Instance) const;

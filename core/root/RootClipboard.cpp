@@ -91,6 +91,18 @@ void TComponentRoot::StreamSelection(TStream* Stream, bool WithMethods, TStrings
   Writer->WriteValue(vaNull);
 }
 
+TRect TComponentRoot::ReadSelectionBounds(TReader* Reader) {
+  // A signature's first byte is no integer tag, so the test is exact.
+  TValueType Next = Reader->NextValue();
+  if (Next != vaInt8 && Next != vaInt16 && Next != vaInt32) return TRect{};
+  TRect Bounds;
+  Bounds.Left = Reader->ReadInteger();
+  Bounds.Top = Reader->ReadInteger();
+  Bounds.Right = Reader->ReadInteger();
+  Bounds.Bottom = Reader->ReadInteger();
+  return Bounds;
+}
+
 void TComponentRoot::CopySelectionToStream(TStream* Stream) {
   if (!FSelections || FSelections->GetCount() == 0) return;
   ForceCommonParent();
@@ -231,8 +243,7 @@ void TComponentRoot::CopyStreamToClipboard(TStream* Stream) {
   TObjectGuard<TMemoryStream> Text(new TMemoryStream);
   {
     TObjectGuard<TReader> Reader(new TReader(Stream, 1024));
-    if (TValueType Next = Reader->NextValue(); Next == vaInt8 || Next == vaInt16 || Next == vaInt32)
-      for (int I = 0; I < 4; ++I) (void)Reader->ReadInteger();
+    (void)ReadSelectionBounds(Reader.Get());
   } // the reader leaves the stream right after what it consumed
   while (PeekByte(Stream) != 0) ObjectBinaryToText(Stream, Text.Get());
   Board.SetText(String(reinterpret_cast<const char*>(Text->Memory()), static_cast<std::size_t>(Text->Size())));

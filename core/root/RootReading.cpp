@@ -240,13 +240,7 @@ void TComponentRoot::ReadStream(TStream* Stream, TComponent* Parent, bool Adjust
   Reader->OnFindComponentClass = TFindComponentClassEvent::Bind<&TComponentRoot::ReaderFindComponentClass>(this);
   Reader->OnCreateComponent = TCreateComponentEvent::Bind<&TComponentRoot::ReaderCreateComponent>(this);
   FAdjustmentRect = Rect;
-  FAdjustmentBounds = TRect{};
-  if (TValueType Next = Reader->NextValue(); Next == vaInt8 || Next == vaInt16 || Next == vaInt32) {
-    FAdjustmentBounds.Left = Reader->ReadInteger();
-    FAdjustmentBounds.Top = Reader->ReadInteger();
-    FAdjustmentBounds.Right = Reader->ReadInteger();
-    FAdjustmentBounds.Bottom = Reader->ReadInteger();
-  }
+  FAdjustmentBounds = ReadSelectionBounds(Reader.Get());
   BeforeReadSelection();
   {
     auto After = OnFailure([this]() noexcept { RunIgnoringExceptions([this] { AfterReadSelection(); }); });

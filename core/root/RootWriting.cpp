@@ -52,7 +52,8 @@ TStream* TComponentRoot::GetRootStream() {
       FModule->Notify(ncFormSaving);
     }
     if (FCustomModule) FCustomModule->Saving();
-    if (FRootUpdateManager && TRootHooks::UpdateManagerModified) TRootHooks::UpdateManagerModified(FRootUpdateManager);
+    // The module and its descendants come up to date with what they inherit.
+    if (FRootUpdateManager && TRootHooks::UpdateManagerUpdate) TRootHooks::UpdateManagerUpdate(FRootUpdateManager);
     TObjectGuard<TMemoryStream> Image(new TMemoryStream);
     WriteRootStream(Image.Get());
     FRootStream = Image.Release();
