@@ -325,9 +325,18 @@ struct FK_API IDesignerModule : IInterface {
   virtual void Close() = 0;
 };
 
-/// A module record that also keeps the views of a module.
+/// A module record that also keeps the views of a module: its view list, lines
+/// "Name=Value" in the order of the module's views, where Value is the device attribute
+/// of the view's device or a single blank when there is none. A module whose record does
+/// not answer to this interface has no views.
 struct FK_API IDesignerViewModule : IDesignerModule {
   FK_INTERFACE(IDesignerViewModule, IDesignerModule, "{AEF995C4-E519-547D-838B-2CD5717CCBE5}")
+  /// Fills `Strings` (the caller's) with the module's view list, replacing what it held.
+  virtual void GetViewNames(TStrings* Strings) = 0;
+  /// Keeps the lines of `Strings` (the caller's) as the module's view list.
+  virtual void SetViewNames(TStrings* Strings) = 0;
+  /// The name of the device attribute whose value a new view's line takes.
+  virtual void GetDeviceAttributeName(String& Name) = 0;
 };
 
 /// The form changed while it was being loaded: the host treats it as modified.

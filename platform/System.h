@@ -128,6 +128,8 @@ FK_API String Trim(std::string_view S);
 FK_API bool IsValidIdent(std::string_view Name) noexcept;
 /// The message of a text that is no integer.
 FK_RESOURCESTRING(SInvalidInteger, "'%s' is not a valid integer value");
+/// The message of an argument that is not one of those a call accepts.
+FK_RESOURCESTRING(SArgumentInvalid, "Invalid argument");
 /// Decimal text of an integer.
 FK_API String IntToStr(long long Value);
 /// Parses a decimal or `$`-prefixed hexadecimal integer; raises `EConvertError`

@@ -5,6 +5,7 @@
 #include "core/Designers.h"
 #include "core/DesignNotifications.h"
 #include "platform/Filer.h"
+#include "platform/ScopeGuard.h"
 
 namespace formkit {
 
@@ -54,6 +55,7 @@ int PPIForItem(const IPtr<IItem>& Item) {
 
 void TComponentRoot::Create(const TCreateArgs& Args) {
   FViewName = Args.ViewName;
+  FViewModule = QueryAs<IDesignerViewModule>(Args.Module);
   FDesigner = QueryAs<IInternalComponentDesigner>(Args.Designer);
   if (!FDesigner) throw EComponentDesignerException("A module on design needs the designer of its framework");
   if (auto All = Designers()) All->ActivateDesigner(Args.Designer);
@@ -367,25 +369,16 @@ void TComponentRoot::Updated(const IPtr<IUpdateManager>& Manager) {
 // Windows
 //===----------------------------------------------------------------------===//
 
-void TComponentRoot::Show() { ShowRootWindow(); }
-
-void TComponentRoot::ShowAs(TShowState State) { ShowRootWindowAs(State); }
-
-void TComponentRoot::Hide() { HideRootWindow(); }
-
 void TComponentRoot::Close() {
   FClosing = true;
-  try {
-    FDesigner->RootListRemove(AsRoot());
-    InternalDeinitializeDesigner(false);
-    FAllowNoSelection = true;
-    ClearSelection();
-    if (FUpdateManagers) FUpdateManagers->Clear();
-  } catch (...) {
-    FClosing = false;
-    throw;
-  }
-  FClosing = false;
+  auto Closed = Finally([this]() noexcept { FClosing = false; });
+  CloseViews();
+  FDesigner->RootListRemove(AsRoot());
+  InternalDeinitializeDesigner(false);
+  FAllowNoSelection = true;
+  ClearSelection();
+  if (FUpdateManagers) FUpdateManagers->Clear();
+  if (IsView()) FAncestorRoot = nullptr;
 }
 
 void TComponentRoot::SetActive(bool Value) {

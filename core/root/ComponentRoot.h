@@ -29,6 +29,7 @@
 #include "core/root/RootHooks.h"
 #include "core/root/RootNames.h"
 #include "core/root/RootStreams.h"
+#include "platform/Lists.h"
 #include "platform/Streams.h"
 
 #include <unordered_map>
@@ -44,6 +45,8 @@ FK_RESOURCESTRING(sReadOnlySource, "Source is read-only");
 FK_RESOURCESTRING(sCannotInherit,
                   "Component class '%s' does not support inheritance and cannot be added to a module that has descendents");
 FK_RESOURCESTRING(sCannotCreateComponentOnView, "This component can only be created on the Master View");
+FK_RESOURCESTRING(sDuplicateViewName, "View \"%s\" already exists in module");
+FK_RESOURCESTRING(sViewDoesntExist, "View \"%s\" does not exist in module");
 FK_RESOURCESTRING(sRenamingAncestor, "Cannot rename component %s, component was introduced in an ancestor form");
 FK_RESOURCESTRING(sComponentAlreadyExists, "A component named %s already exists in a descendant module");
 FK_RESOURCESTRING(sRootMustHaveName, "Root component must have a name");
@@ -173,9 +176,14 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void Modified() override;
   void ModifiedUpdateNotification() override;
   void UpdateOptions() override;
+  /// Shows the design window: a view makes itself its master's active view first, a
+  /// master shows its active view's window.
   void Show() override;
   void ShowAs(TShowState State);
+  /// Hides the design window of a view, or of a master's active view.
   void Hide() override;
+  /// Closes the module, its views first. A view lets go of its master here, so a master
+  /// and its views, which hold each other, are freed once the host lets go of them.
   void Close() override;
   void SetActive(bool Value) override;
   void SetControlsLocked(bool Value) override;
@@ -454,15 +462,6 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void GoDormant() override;
   void ShowHelp() override;
   IPtr<IDesigner> GetDesigner() override { return AsDesigner(); }
-  IPtr<IRoot> GetActiveView() override { return AsRoot(); }
-  int GetViewCount() override { return 0; }
-  IPtr<IRoot> GetView(int Index) override;
-  String GetViewName(int Index) override;
-  int GetViewIndex(const String&) override { return -1; }
-  IPtr<IRoot> GetMasterView() override { return nullptr; }
-  int AddView(const String& Name) override;
-  void GetViewPreview(TPersistent* Bitmap) override;
-  void GetViewPreview(const String& ViewName, TPersistent* Bitmap) override;
   void RemoveView(const String& Name) override;
   void RemoveView(int Index) override;
   void HideForModule() override { Hide(); }
@@ -478,12 +477,49 @@ class FK_API TComponentRoot : public TInterfacedObject,
   /// Brings a dormant module back from its stream; nothing for a live one. A failed read
   /// passes on and leaves the module dormant with its stream.
   void Resurrect() override;
-  void SetActiveView(const IPtr<IRoot>&) override {}
   IPtr<IRoot> GetAncestorRoot() override { return IPtr<IRoot>(FAncestorRoot); }
   void CancelModes() override;
   void CopySelectionToStream(TStream* Stream) override;
-  bool IsView() override { return false; }
   bool SpecialPropertyHelp(const String& Member, String& HelpKeyword, String& HelpFile, int& HelpType) override;
+
+  // Views: alternate forms of one module, stored as their differences (RootViews.cpp) ---
+  // A view is a root of its own whose ancestor is the master root of the same module.
+  // The master owns its views; on a view, the operations that say so go to the master.
+  /// The view shown now: this root while no view is active. Goes to the master.
+  IPtr<IRoot> GetActiveView() override;
+  /// The number of the master's views; 0 on a view.
+  int GetViewCount() override;
+  /// View `Index`; raises `EListError` for an index outside the list.
+  IPtr<IRoot> GetView(int Index) override;
+  /// The name of view `Index`; raises `EListError` for an index outside the list.
+  String GetViewName(int Index) override;
+  /// This view's own name; empty on a master.
+  String GetViewName() const { return FViewName; }
+  /// The first view named `Name` without regard to case, or -1. Goes to the master.
+  int GetViewIndex(const String& Name) override;
+  /// The master of a view: its ancestor when that is a root of the same module; null
+  /// for a master, even one with an ancestor of its own.
+  IPtr<IRoot> GetMasterView() override;
+  /// Adds an empty view named `Name` and gives its index; -1 without a host that keeps
+  /// views. Raises `sDuplicateViewName` for a name of the view list. Goes to the master.
+  int AddView(const String& Name) override;
+  /// Draws this root's own preview into `Bitmap` (the caller's): the framework's.
+  void GetViewPreview(TPersistent* Bitmap) override = 0;
+  /// Draws the view `ViewName`, or the frame of a device of that name when the module
+  /// has no such view, into `Bitmap`. Goes to the master.
+  void GetViewPreview(const String& ViewName, TPersistent* Bitmap) override;
+  /// Makes `View` (this master, or one of its views) the one shown; raises
+  /// `EArgumentException` for another root. Goes to the master.
+  void SetActiveView(const IPtr<IRoot>& View) override;
+  bool IsView() override { return GetMasterView() != nullptr; }
+  /// Makes the views of a module just opened or created: those a creator (`Source`
+  /// answering to `IDesignerViewsCreator`) brings, and those the view list names.
+  void CreateDesignerViews(const IPtr<IInterface>& Source);
+  /// Closes every view, the last first; they stay the master's.
+  void CloseViews();
+  /// The item of the master that stands for `Item` of this view: the master's root for
+  /// this root, the component of the same name for another. `Item` itself on a master.
+  [[nodiscard]] IPtr<IItem> GetMasterViewComponent(const IPtr<IItem>& Item);
 
   // IDesigner: what the designer interface adds ----------------------------------------
   void Activate() override;
@@ -527,6 +563,9 @@ class FK_API TComponentRoot : public TInterfacedObject,
   TShiftState GetShiftState() override;
 
   IPtr<IDesignEnvironment> GetEnvironment();
+  /// The clipboard of the platform the framework runs on; windows beside the designer
+  /// copy and paste through it too.
+  virtual TDesignClipboard& Clipboard() = 0;
 
 protected:
   // The framework's part --------------------------------------------------------------
@@ -573,8 +612,6 @@ protected:
   virtual TQueryRedirectLinksResult AskRedirectLinks(const String& RootName, const String& LinkedName) = 0;
   /// Removes or redirects the links of `Root` to module `LinkedName`.
   virtual void RedirectLinks(TComponent* Root, const String& LinkedName) = 0;
-  /// The clipboard of the platform the framework runs on.
-  virtual TDesignClipboard& Clipboard() = 0;
   /// Whether the generated class of another module may stand nested in this one.
   virtual bool CanNestClass(TClass Class) = 0;
   /// The class group activated around every read: the framework's.
@@ -592,6 +629,9 @@ protected:
   virtual TDeleteWarnResult AskDeleteWarning(const String& ComponentName, const String& Names) = 0;
   /// Mirrors the children of the root (`AllChildren`) or of the selection, right to left.
   virtual void FlipRootChildren(bool AllChildren) = 0;
+  /// Draws the frame of the device `ViewName`, for which the module has no view, into
+  /// `Bitmap` (the caller's).
+  virtual void RenderViewPreview(const String& ViewName, TPersistent* Bitmap) = 0;
 
   // State -------------------------------------------------------------------------------
   IPtr<IInternalComponentDesigner> FDesigner;
@@ -608,6 +648,17 @@ protected:
   String FRootBaseClass;
   String FRootName;
   String FViewName;
+  /// The module record as a keeper of views; null when the host keeps none.
+  IPtr<IDesignerViewModule> FViewModule;
+  /// One view of a master: its name and its root, which the master owns.
+  struct TDesignerView {
+    String Name;
+    IPtr<IInternalRoot> Root;
+  };
+  /// The master's views, in the order of the module's view list; empty on a view.
+  std::vector<TDesignerView> FDesignerViews;
+  /// The index of the view shown; -1 for the master itself.
+  int FActiveView = -1;
   TComponent* FRoot = nullptr;
   TClass FRootClass = nullptr;
   TClass FCustomModuleClass = nullptr;
@@ -658,6 +709,19 @@ protected:
 
 private:
   void CreateNewModule(const TCreateArgs& Args);
+  /// The master of this view, or null on a master.
+  [[nodiscard]] TComponentRoot* MasterOfView();
+  /// Makes the root of view `Name`, read from `Stream`, from its file (`Existing`) or
+  /// new, and appends it to the views; gives its index.
+  int InternalAddView(const String& Name, bool Existing, const IPtr<IDatedStream>& Stream);
+  /// The view list of the module record in a new string list.
+  [[nodiscard]] TObjectGuard<TStringList> FetchViewList();
+  /// The last step of every creation: selects `Component`, shows it, marks the change.
+  TComponent* SelectCreated(TComponent* Component);
+  /// The root whose window a master shows: its active view, or itself.
+  [[nodiscard]] TComponentRoot* ShownRoot();
+  /// Raises the list's range error unless `Index` names a view.
+  void CheckViewIndex(int Index) const;
   /// Reads the module from the stream given, or from its file.
   void ReadExistingModule(const TCreateArgs& Args);
   TComponent* CreateRootAs(const String& ClassName, const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot);

@@ -85,6 +85,13 @@ TComponent* TComponentRoot::DoCreateComponent(const IPtr<IInternalPaletteItem>& 
   try {
     if (Rect.IsEmpty()) Parent = FindCurrentParentItem();
     TScale Scale(PPIForItem(Parent));
+    if (TComponentRoot* Master = MasterOfView()) {
+      // Only the master takes new components; the update from master to view brings it.
+      TComponent* Made = Master->DoCreateComponent(PaletteItem, GetMasterViewComponent(Parent), Rect, SetBounds, true);
+      FCreateContainers = true;
+      TComponent* Here = Made ? FRoot->FindComponent(Made->Name()) : nullptr;
+      return Here ? SelectCreated(Here) : nullptr;
+    }
     Component = PaletteItem->CreateComponent(FRoot, ExtractComponent(Parent), FModule, Rect);
     if (!Component) {
       FCreateContainers = true;
@@ -175,6 +182,10 @@ TComponent* TComponentRoot::DoCreateComponent(const IPtr<IInternalPaletteItem>& 
     throw;
   }
   FCreateContainers = true;
+  return SelectCreated(Component);
+}
+
+TComponent* TComponentRoot::SelectCreated(TComponent* Component) {
   Select(Component, false);
   if (FSurface) FSurface->UpdateSurface();
   Modified();

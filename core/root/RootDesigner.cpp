@@ -116,25 +116,6 @@ bool TComponentRoot::SpecialPropertyHelp(const String&, String&, String&, int&) 
 
 void TComponentRoot::ShowHelp() {}
 
-//===----------------------------------------------------------------------===//
-// Files, views, streams: joining with their own units
-//===----------------------------------------------------------------------===//
-
-
-IPtr<IRoot> TComponentRoot::GetView(int Index) { throw EListError(SListIndexError, Index); }
-
-String TComponentRoot::GetViewName(int Index) { throw EListError(SListIndexError, Index); }
-
-int TComponentRoot::AddView(const String&) { RaiseServiceNotAvailable("Adding a view"); }
-
-void TComponentRoot::GetViewPreview(TPersistent*) { RaiseServiceNotAvailable("A view preview"); }
-
-void TComponentRoot::GetViewPreview(const String&, TPersistent*) { RaiseServiceNotAvailable("A view preview"); }
-
-void TComponentRoot::RemoveView(const String&) {}
-
-void TComponentRoot::RemoveView(int Index) { throw EListError(SListIndexError, Index); }
-
 void TComponentRoot::CancelModes() {
   if (FSurfaceDesigner) FSurfaceDesigner->CancelDragging();
 }

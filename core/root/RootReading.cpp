@@ -259,6 +259,8 @@ void TComponentRoot::SelectReadStream(TStream* Stream, TComponent* Parent, bool 
   if (!Active) Active = QueryAs<IInternalRoot>(AsRoot());
   if (auto Master = QueryAs<IInternalRoot>(Active->GetMasterView())) Active = Master;
   auto* Target = dynamic_cast<TComponentRoot*>(Active->Implementor());
+  // A parent of a view stands for the master's component of the same name.
+  if (Parent && FSurface) Parent = ExtractComponent(GetMasterViewComponent(FSurface->ItemFromComponent(Parent)));
   Target->ClearSelection();
   IPtr<ISelections> Items = Target->SelectionItems();
   if (Items) Items->BeginSelections();

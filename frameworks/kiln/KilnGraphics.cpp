@@ -1,6 +1,8 @@
 //===- frameworks/kiln/KilnGraphics.cpp - Colours, fonts, canvases -------===//
 #include "frameworks/kiln/KilnGraphics.h"
 
+#include <algorithm>
+
 namespace formkit {
 
 FK_RESOURCESTRING(SInvalidFontSize, "Font size %d is not valid: a font is at least 1 point");
@@ -303,6 +305,22 @@ String TCanvas::Text() const {
     S += '\n';
   }
   return S;
+}
+
+//===----------------------------------------------------------------------===//
+// TBitmap
+//===----------------------------------------------------------------------===//
+
+FK_IMPLEMENT(TBitmap, "KilnGraphics") {}
+
+void TBitmap::BeforeDestruction() {
+  FCanvas.Reset();
+  inherited::BeforeDestruction();
+}
+
+void TBitmap::SetSize(int Width, int Height) noexcept {
+  FWidth = std::max(Width, 0);
+  FHeight = std::max(Height, 0);
 }
 
 } // namespace formkit

@@ -233,4 +233,28 @@ private:
   std::vector<String> FLines;
 };
 
+//===----------------------------------------------------------------------===//
+// Bitmap
+//===----------------------------------------------------------------------===//
+
+/// A picture of a size, drawn on through its own canvas (which records the calls).
+class FK_API TBitmap : public TPersistent {
+  FK_CLASS(TBitmap, TPersistent)
+
+  TBitmap() : FCanvas(new TCanvas) {}
+  void BeforeDestruction() override;
+
+  int Width() const noexcept { return FWidth; }
+  int Height() const noexcept { return FHeight; }
+  /// Gives the picture a new size; negative sizes count as 0. What was drawn is kept.
+  void SetSize(int Width, int Height) noexcept;
+  /// The canvas, the bitmap's own.
+  TCanvas* Canvas() const noexcept { return FCanvas.Get(); }
+
+private:
+  TObjectGuard<TCanvas> FCanvas;
+  int FWidth = 0;
+  int FHeight = 0;
+};
+
 } // namespace formkit

@@ -7,6 +7,7 @@ namespace formkit::fakes {
 
 FK_IMPLEMENT(TRecordingEnvironment, "Fakes") {}
 FK_IMPLEMENT(TRecordingModule, "Fakes") {}
+FK_IMPLEMENT(TViewRecordingModule, "Fakes") {}
 FK_IMPLEMENT(TFakeRoot, "Fakes") {}
 FK_IMPLEMENT(TFakeDesigner, "Fakes") {}
 

@@ -25,8 +25,9 @@
 
 namespace formkit::fakes {
 
-class TRecordingModule : public TInterfacedObject, public IDesignerModule, public IOTAModule {
+class TRecordingModule : public TInterfacedObject, public IDesignerViewModule, public IOTAModule {
   FK_CLASS(TRecordingModule, TInterfacedObject)
+  // The view operations are here for `TViewRecordingModule`, which alone answers for them.
   FK_INTERFACES(IDesignerModule, IOTAModule)
 
   explicit TRecordingModule(String FileName = "Unit1.kfm", TCallLog* Log = nullptr)
@@ -126,6 +127,22 @@ class TRecordingModule : public TInterfacedObject, public IDesignerModule, publi
   }
   void Close() override { FLog->Add("Close"); }
 
+  // IDesignerViewModule, answered by `TViewRecordingModule`
+  /// The view list the host keeps, lines "Name=Value".
+  std::vector<String> ViewList;
+  /// The device attribute the view list takes its values from.
+  String DeviceAttributeName = "Size";
+  void GetViewNames(TStrings* Strings) override {
+    Strings->Clear();
+    for (const String& Line : ViewList) Strings->Add(Line);
+  }
+  void SetViewNames(TStrings* Strings) override {
+    FLog->Add("SetViewNames(" + Strings->CommaText() + ")");
+    ViewList.clear();
+    for (int I = 0; I < Strings->Count(); ++I) ViewList.push_back(Strings->Get(I));
+  }
+  void GetDeviceAttributeName(String& Name) override { Name = DeviceAttributeName; }
+
   // IOTAModule
   int GetModuleFileCount() override { return 1; }
   String GetModuleFileName(int) override { return FFileName; }
@@ -160,6 +177,13 @@ private:
   TCallLog FOwnLog;
   TCallLog* FLog;
   String FFileName;
+};
+
+/// A recording module record that also keeps the module's views.
+class TViewRecordingModule : public TRecordingModule {
+  FK_CLASS(TViewRecordingModule, TRecordingModule)
+  FK_INTERFACES(IDesignerViewModule)
+  using TRecordingModule::TRecordingModule;
 };
 
 } // namespace formkit::fakes

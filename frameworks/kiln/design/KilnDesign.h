@@ -31,6 +31,7 @@
 namespace formkit {
 
 class TKilnSurface;
+class TKilnRoot;
 
 /// The size of the icon of a non-visual component on a surface.
 inline constexpr int KilnIconSize = 28;
@@ -68,6 +69,12 @@ class FK_API TKilnDesigner : public TComponentDesigner {
   bool IsFileReadOnly(const String& FileSystem, const String& Name) override;
   bool DeleteFile(const String& FileSystem, const String& Name) override;
   void FileWritten(const String& FileSystem, TStream* Stream) override;
+
+private:
+  /// A master just made makes its views: those the module record brings when it is
+  /// also a creator of views (a module a wizard makes), and those its view list names.
+  /// A module whose views cannot be made is closed again and the failure passes on.
+  IPtr<IRoot> WithViews(const IPtr<TKilnRoot>& Root, const IPtr<IDesignerModule>& Module, const String& ViewName);
 };
 
 FK_RESOURCESTRING(sKilnControlOnDataModule, "Controls cannot be added to a data module (%s)");
@@ -221,6 +228,13 @@ class FK_API TKilnRoot : public TComponentRoot {
   /// The window that shows the module.
   TCustomForm* DesignWindow() const noexcept { return FWindow; }
 
+  // Previews of views -------------------------------------------------------------------
+  /// Draws the module's form into `Bitmap`, a `TBitmap` (anything else is left as it is):
+  /// sized to the form, each control a framed rectangle with its name, in paint order.
+  void GetViewPreview(TPersistent* Bitmap) override;
+  /// Whether the module changed since its preview was last drawn.
+  bool PreviewOutOfDate() const noexcept { return FGeneratePreview; }
+
 protected:
   void HideRootWindow() override;
   void ShowRootWindow() override;
@@ -258,6 +272,9 @@ protected:
   /// Moves a pasted control by what moves the selection's bounds to `Rect`'s top left;
   /// nothing when either is empty or the control is not on the top of the paste.
   void AdjustReadComponent(TComponent* Component, const TRect& Rect, const TRect& Bounds) override;
+  /// Draws an empty frame of the bitmap's size, or of the form's when the bitmap has
+  /// none, captioned with the device's name.
+  void RenderViewPreview(const String& ViewName, TPersistent* Bitmap) override;
 
 private:
   void LinkDesigner(TComponent* Instance, bool Link);

@@ -7,6 +7,7 @@
 #include "frameworks/kiln/Kiln.h"
 #include "inheritance/Proxies.h"
 #include "inheritance/UpdateManager.h"
+#include "platform/ScopeGuard.h"
 
 #include <sys/stat.h>
 #include <cstdio>
@@ -50,7 +51,7 @@ IPtr<IRoot> TKilnDesigner::CreateRoot(const IPtr<IDesignerModule>& Module, const
   IPtr<TKilnRoot> Root = New<TKilnRoot>();
   Root->Create({IPtr<IComponentDesigner>(this), Module, FileName, AExisting, nullptr, AFormName, AAncestorName,
                 AFileSystem, AAncestorRoot, AViewName});
-  return Root->AsRoot();
+  return WithViews(Root, Module, AViewName);
 }
 
 IPtr<IRoot> TKilnDesigner::CreateRootFromStream(const IPtr<IDesignerModule>& Module, const String& FileName,
@@ -59,6 +60,16 @@ IPtr<IRoot> TKilnDesigner::CreateRootFromStream(const IPtr<IDesignerModule>& Mod
   IPtr<TKilnRoot> Root = New<TKilnRoot>();
   Root->Create({IPtr<IComponentDesigner>(this), Module, FileName, true, AStream, "", "", AFileSystem, AAncestorRoot,
                 AViewName});
+  return WithViews(Root, Module, AViewName);
+}
+
+IPtr<IRoot> TKilnDesigner::WithViews(const IPtr<TKilnRoot>& Root, const IPtr<IDesignerModule>& Module,
+                                     const String& ViewName) {
+  if (ViewName.empty()) {
+    // A view that cannot be read leaves no half-open module behind.
+    auto Undo = OnFailure([&]() noexcept { RunIgnoringExceptions([&] { Root->Close(); }); });
+    Root->CreateDesignerViews(Module);
+  }
   return Root->AsRoot();
 }
 

@@ -217,6 +217,44 @@ void TKilnRoot::FlipRootChildren(bool AllChildren) {
   Modified();
 }
 
+//===----------------------------------------------------------------------===//
+// Previews
+//===----------------------------------------------------------------------===//
+
+namespace {
+void DrawControls(TCanvas* Canvas, TWinControl* Parent, TPoint Origin) {
+  for (int I = 0; I < Parent->ControlCount(); ++I) {
+    TControl* C = Parent->Controls(I);
+    TRect R = C->BoundsRect();
+    R.Offset(Origin.X, Origin.Y);
+    Canvas->Rectangle(R);
+    Canvas->TextOut(R.Left + 2, R.Top + 2, C->Name());
+    if (auto* W = dynamic_cast<TWinControl*>(C)) DrawControls(Canvas, W, R.TopLeft());
+  }
+}
+} // namespace
+
+void TKilnRoot::GetViewPreview(TPersistent* Bitmap) {
+  auto* Target = dynamic_cast<TBitmap*>(Bitmap);
+  auto* Form = dynamic_cast<TWinControl*>(FRoot);
+  if (!Target || !Form) return;
+  Target->SetSize(Form->ClientWidth(), Form->ClientHeight());
+  TCanvas* Canvas = Target->Canvas();
+  Canvas->Brush()->SetColor(Form->Color());
+  Canvas->FillRect(Rect(0, 0, Target->Width(), Target->Height()));
+  DrawControls(Canvas, Form, {0, 0});
+  FGeneratePreview = false;
+}
+
+void TKilnRoot::RenderViewPreview(const String& ViewName, TPersistent* Bitmap) {
+  auto* Target = dynamic_cast<TBitmap*>(Bitmap);
+  if (!Target) return;
+  if (Target->Width() == 0 || Target->Height() == 0)
+    if (auto* Form = dynamic_cast<TControl*>(FRoot)) Target->SetSize(Form->Width(), Form->Height());
+  Target->Canvas()->FrameRect(Rect(0, 0, Target->Width(), Target->Height()));
+  Target->Canvas()->TextOut(4, 4, ViewName);
+}
+
 TKilnSurface* KilnSurfaceOf(const IPtr<IRoot>& Root) {
   auto Internal = QueryAs<IInternalRoot>(Root);
   auto* Kiln = Internal ? dynamic_cast<TKilnRoot*>(Internal->Implementor()) : nullptr;
