@@ -5,6 +5,7 @@
 #include "core/Designers.h"
 #include "frameworks/kiln/Kiln.h"
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "platform/DeviceInfo.h"
 #include "platform/ScopeGuard.h"
 
 #include <algorithm>
@@ -154,6 +155,17 @@ void THostModule::InsertMethodSource(const String& Text, TStrings* Renames, TStr
     Inserted->Add(Name);
 }
 
+void THostModule::GetViewNames(TStrings* Strings) {
+  Strings->Clear();
+  for (const String& Line : FSource.Views) Strings->Add(Line);
+}
+
+void THostModule::SetViewNames(TStrings* Strings) {
+  FSource.Views.clear();
+  for (int I = 0; I < Strings->Count(); ++I) FSource.Views.push_back(Strings->Get(I));
+  FModified = true;
+}
+
 void THostModule::CheckWritable() {
   if (ReadOnly) throw EComponentDesignerException(sModuleReadOnly, GetUnitName());
 }
@@ -173,6 +185,10 @@ TDesignSession::TDesignSession() {
   FEnvironment = New<THostEnvironment>(this);
   InitializeDesigners(InterfaceOf<IDesignEnvironment>(FEnvironment.Get()));
   FDesigner = Designers()->DesignerFromExtension(".kfm");
+  // The devices a module's views are named after.
+  TDeviceInfo::AddDevice("Phone", {{"Size", "360x640"}});
+  TDeviceInfo::AddDevice("Tablet", {{"Size", "768x1024"}});
+  TDeviceInfo::AddDevice("Desktop", {{"Size", "1280x800"}});
   SessionRunning = true;
 }
 
@@ -187,6 +203,7 @@ TDesignSession::~TDesignSession() {
   StopDesignCore();
   FinalizeKiln();
   FEnvironment = nullptr;
+  TDeviceInfo::ClearDevices();
   SessionRunning = false;
 }
 
@@ -238,8 +255,9 @@ IPtr<IRoot> TDesignSession::NewModule(const String& Path, const String& Ancestor
 }
 
 void TDesignSession::Save(const IPtr<IRoot>& Root) {
-  Root->Save();
-  if (THostModule* Module = ModuleOf(Root)) Module->SaveSource();
+  IPtr<IRoot> Master = Root->GetMasterView() ? Root->GetMasterView() : Root;
+  Master->Save();
+  if (THostModule* Module = ModuleOf(Master)) Module->SaveSource();
 }
 
 void TDesignSession::SaveAs(const IPtr<IRoot>& Root, const String& Path) {
@@ -259,8 +277,11 @@ void TDesignSession::Close(const IPtr<IRoot>& Root) {
 }
 
 IPtr<IRoot> TDesignSession::Find(const String& Name) const {
-  for (const IPtr<IRoot>& R : FModules)
+  for (const IPtr<IRoot>& R : FModules) {
     if (R->GetRoot() && SameText(R->GetRootName(), Name)) return R;
+    for (int I = 0, N = R->GetViewCount(); I < N; ++I)
+      if (IPtr<IRoot> View = R->GetView(I); View->GetRoot() && SameText(View->GetRootName(), Name)) return View;
+  }
   return nullptr;
 }
 

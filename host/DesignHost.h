@@ -103,9 +103,9 @@ private:
 /// The host's record of one module: its file name and the source file beside it
 /// (`.fks`), which follows the designer's renames and handlers and is written with the
 /// module.
-class FK_API THostModule : public TInterfacedObject, public IDesignerModule {
+class FK_API THostModule : public TInterfacedObject, public IDesignerViewModule {
   FK_CLASS(THostModule, TInterfacedObject)
-  FK_INTERFACES(IDesignerModule)
+  FK_INTERFACES(IDesignerViewModule)
   THostModule() = default;
   /// Reads the source beside `FileName`, if there is one.
   explicit THostModule(const String& FileName);
@@ -164,6 +164,12 @@ class FK_API THostModule : public TInterfacedObject, public IDesignerModule {
   void Close() override {}
   bool IsModified() const noexcept { return FModified; }
 
+  // IDesignerViewModule: the view list is kept in the source
+  void GetViewNames(TStrings* Strings) override;
+  void SetViewNames(TStrings* Strings) override;
+  /// "Size": a view named after a device takes its size.
+  void GetDeviceAttributeName(String& Name) override { Name = "Size"; }
+
 private:
   String FFileName;
   TModuleSource FSource;
@@ -193,12 +199,13 @@ public:
   /// A new module of a form class named after the file ("Form3.kfm": Form3), inheriting
   /// from the open or openable module `AncestorName` when given.
   IPtr<IRoot> NewModule(const String& Path, const String& AncestorName = "");
-  /// Writes the module file through the module's own `Save`, then its source.
+  /// Writes the module file through the module's own `Save` (a master's views go along;
+  /// a view saves its master), then its source.
   void Save(const IPtr<IRoot>& Root);
   /// Writes the module under another file name (its source goes along).
   void SaveAs(const IPtr<IRoot>& Root, const String& Path);
   void Close(const IPtr<IRoot>& Root);
-  /// The open module named `Name` (its root's name), or null.
+  /// The open module named `Name` (its root's name, "Form1_Tall" for a view), or null.
   [[nodiscard]] IPtr<IRoot> Find(const String& Name) const;
   /// The open modules, in the order they were opened.
   const std::vector<IPtr<IRoot>>& Modules() const noexcept { return FModules; }

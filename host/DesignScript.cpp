@@ -103,7 +103,7 @@ namespace {
 
 class TScriptRun {
 public:
-  TScriptRun() = default;
+  explicit TScriptRun(std::ostream& Out) : FOut(Out) {}
 
   void Step(const std::vector<String>& Words, const String& Rest) {
     const String& Verb = Words[0];
@@ -179,7 +179,12 @@ public:
     } else if (Verb == "flip") {
       Root()->FlipChildren(!(Words.size() > 1 && SameText(Words[1], "all")));
     } else if (Verb == "revert") {
-      Root()->Command(dmRevert);
+      Revert(Words.size() > 1 ? Words[1] : String());
+    } else if (Verb == "view") {
+      Need(2, "add|remove|show and a NAME");
+      View(Words[1], Words[2]);
+    } else if (Verb == "views") {
+      PrintViews();
     } else if (Verb == "save") {
       Save(Current());
     } else if (Verb == "saveas") {
@@ -197,6 +202,55 @@ public:
   TFileJournal& Journal() noexcept { return FJournal; }
 
 private:
+  void Revert(const String& Answer) {
+    if (!Answer.empty() && !SameText(Answer, "yes") && !SameText(Answer, "no")) throw EHostError(sUnknownHow, Answer);
+    TDeleteWarnResult Given = Answer.empty() ? dwCancel : SameText(Answer, "yes") ? dwYes : dwNo;
+    TKilnRoot::DeleteWarningAnswer = [Given](const String&) { return Given; };
+    auto Forget = Finally([]() noexcept { TKilnRoot::DeleteWarningAnswer = nullptr; });
+    Root()->Command(dmRevert);
+  }
+  /// The master of the current module: the module itself unless it is a view.
+  IPtr<IRoot> Master() const {
+    IPtr<IRoot> Master = Current()->GetMasterView();
+    return Master ? Master : Current();
+  }
+  void View(const String& How, const String& Name) {
+    IPtr<IRoot> Module = Master();
+    if (How == "add") {
+      Module->AddView(Name);
+    } else if (How == "remove") {
+      int Index = ViewIndex(Module, Name);
+      IPtr<IRoot> Gone = Module->GetView(Index);
+      // The master is shown in the place of the view that goes, and is worked on next.
+      if (Module->GetActiveView().Get() == Gone.Get()) {
+        TDesignSession::RootOf(Module)->SetActiveView(Module);
+        Module->Show();
+      }
+      Module->RemoveView(Index);
+      if (FCurrent.Get() == Gone.Get()) Use(Module);
+    } else if (How == "show") {
+      IPtr<IRoot> Shown = SameText(Name, "master") ? Module : Module->GetView(ViewIndex(Module, Name));
+      Shown->Show();
+      Use(Shown);
+    } else {
+      throw EHostError(sUnknownHow, How);
+    }
+  }
+  static int ViewIndex(const IPtr<IRoot>& Module, const String& Name) {
+    int Index = Module->GetViewIndex(Name);
+    if (Index < 0) throw EComponentDesignerException(sViewDoesntExist, Name);
+    return Index;
+  }
+  void PrintViews() {
+    IPtr<IRoot> Module = Master();
+    THostModule* Record = FSession.ModuleOf(Module);
+    for (int I = 0, N = Module->GetViewCount(); I < N; ++I) {
+      String Line = Record && I < static_cast<int>(Record->Source().Views.size()) ? Record->Source().Views[I] : String();
+      String Size = Trim(Line.substr(std::min(Line.size(), Line.find('=') + 1)));
+      FOut << Module->GetViewName(I) << "\t" << (Size.empty() ? "-" : Size) << "\t"
+           << std::filesystem::path(Module->GetView(I)->GetFileName()).filename().string() << "\n";
+    }
+  }
   void Use(const IPtr<IRoot>& Module) { FCurrent = Module; }
   const IPtr<IRoot>& Current() const {
     if (!FCurrent || !FCurrent->GetRoot()) throw EHostError(sNoModule);
@@ -251,10 +305,13 @@ private:
       FJournal.Keep(std::filesystem::path(P).replace_extension(Extension).string());
   }
   void Save(const IPtr<IRoot>& Module) {
-    KeepFilesOf(Module->GetFileName());
-    FSession.Save(Module);
+    IPtr<IRoot> Saved = Module->GetMasterView() ? Module->GetMasterView() : Module;
+    KeepFilesOf(Saved->GetFileName());
+    for (int I = 0, N = Saved->GetViewCount(); I < N; ++I) KeepFilesOf(Saved->GetView(I)->GetFileName());
+    FSession.Save(Saved);
   }
 
+  std::ostream& FOut;
   TDesignSession FSession;
   TFileJournal FJournal;
   IPtr<IRoot> FCurrent;
@@ -277,10 +334,21 @@ std::vector<String> WordsOf(const String& Line, String& Rest) {
 
 } // namespace
 
+void RunDesignSteps(const std::vector<std::vector<String>>& Steps, std::ostream& Out) {
+  TScriptRun Run(Out);
+  auto PutBack = OnFailure([&]() noexcept { Run.Journal().Restore(); });
+  for (const std::vector<String>& Words : Steps) {
+    if (Words.empty()) continue;
+    String Rest;
+    for (std::size_t I = 2; I < Words.size(); ++I) Rest += (I > 2 ? " " : "") + Words[I];
+    Run.Step(Words, Rest);
+  }
+}
+
 void RunDesignScript(const String& Path, std::ostream& Out) {
   std::ifstream In(Path);
   if (!In) throw EHostError(sScriptNotFound, Path);
-  TScriptRun Run;
+  TScriptRun Run(Out);
   int LineNumber = 0;
   auto PutBack = OnFailure([&]() noexcept { Run.Journal().Restore(); });
   for (String Line; std::getline(In, Line);) {

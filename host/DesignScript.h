@@ -51,7 +51,12 @@ namespace formkit {
   "  size HOW [VALUE]          sizes the selection: hgrow, hshrink, habsolute, vgrow,\n"          \
   "                            vshrink, vabsolute, widths, heights, widthheight\n"                 \
   "  flip [all]                mirrors the selected containers' children (all: the form's)\n"     \
-  "  revert                    gives the selected inherited components back their ancestor's\n"  \
+  "  revert [yes|no]           gives the selected inherited components back their ancestor's;\n" \
+  "                            the answer when that deletes their own children (else cancel)\n" \
+  "  view add|remove NAME      adds a view of the module (named after a device: Phone,\n"         \
+  "                            Tablet, Desktop, or any name) or removes one\n"                   \
+  "  view show NAME|master     shows a view or the master; it becomes the current module\n"      \
+  "  views                     prints the module's views: name, device size, file\n"            \
   "  save | saveas FILE        writes the current module and its source\n"                         \
   "  close                     closes the current module\n"                                         \
   "  expect NAME.PROP VALUE    stops the script unless the property shows VALUE\n"
@@ -84,5 +89,10 @@ private:
 /// "SCRIPT:LINE: message" for the first step that fails, after every file it wrote
 /// was put back.
 FK_API void RunDesignScript(const String& Path, std::ostream& Out);
+
+/// Runs steps given as their words (a path may hold blanks), as a script's lines would
+/// give them; what a step prints goes to `Out`. Raises the failing step's message after
+/// every file the steps wrote was put back.
+FK_API void RunDesignSteps(const std::vector<std::vector<String>>& Steps, std::ostream& Out);
 
 } // namespace formkit

@@ -35,6 +35,12 @@ const char* const MainHelp =
     "  run SCRIPT                     runs a script of design steps, one a line\n"
     "  render FILE OUT.png|OUT.svg [--select NAME...]\n"
     "                                 draws the module, the named components selected\n"
+    "  align FILE HOW NAME...         lines up, spaces, centres or orders components\n"
+    "  size FILE HOW NAME... [--to N] sizes components alike or to a size\n"
+    "  flip FILE [--all | NAME...]    mirrors the children of containers right to left\n"
+    "  revert FILE NAME... [--yes|--no]  gives inherited components their ancestor's values\n"
+    "  views FILE [--add NAME]... [--remove NAME]...\n"
+    "                                 lists, adds and removes the module's views\n"
     "\n"
     "'formkit SUBCOMMAND --help' tells more of each.\n"
     "\n"
@@ -131,8 +137,108 @@ void Render(const std::vector<String>& Args, std::ostream&) {
   RenderFormToFile(Root->GetRoot(), Selection, Args[1]);
 }
 
+//===----------------------------------------------------------------------===//
+// Commands that change a module through design steps
+//===----------------------------------------------------------------------===//
+
+/// Opens `File`, takes `Steps` and saves; a failing step leaves every file as it was.
+void ChangeModule(const String& File, std::vector<std::vector<String>> Steps, std::ostream& Out) {
+  Steps.insert(Steps.begin(), {"open", File});
+  Steps.push_back({"save"});
+  RunDesignSteps(Steps, Out);
+}
+
+/// The words of `Args` from `From` up to the first option, after `Verb`.
+std::vector<String> WordsUpToOption(const char* Verb, const std::vector<String>& Args, std::size_t From) {
+  std::vector<String> Words{Verb};
+  for (std::size_t I = From; I < Args.size() && Args[I].rfind("--", 0) != 0; ++I) Words.push_back(Args[I]);
+  return Words;
+}
+
+void Align(const std::vector<String>& Args, std::ostream& Out) {
+  std::vector<String> Select = WordsUpToOption("select", Args, 2);
+  if (Select.size() + 2 <= Args.size()) throw EUsageError(sUnknownOption, Args[Select.size() + 1], "align", "align");
+  ChangeModule(Args[0], {Select, {"align", Args[1]}}, Out);
+}
+
+void Size(const std::vector<String>& Args, std::ostream& Out) {
+  std::vector<String> Select = WordsUpToOption("select", Args, 2);
+  std::vector<String> Step{"size", Args[1]};
+  for (std::size_t I = Select.size() + 1; I < Args.size(); ++I) {
+    if (Args[I] != "--to") throw EUsageError(sUnknownOption, Args[I], "size", "size");
+    if (I + 1 >= Args.size()) throw EUsageError(sMissingArguments, "size --to", "a size N", "size");
+    Step.push_back(Args[++I]);
+  }
+  if (Select.size() < 2) throw EUsageError(sMissingArguments, "size", "FILE HOW NAME...", "size");
+  ChangeModule(Args[0], {Select, Step}, Out);
+}
+
+void Flip(const std::vector<String>& Args, std::ostream& Out) {
+  std::vector<String> Select = WordsUpToOption("select", Args, 1);
+  std::vector<std::vector<String>> Steps;
+  if (Select.size() > 1) Steps.push_back(Select);
+  for (std::size_t I = Select.size(); I < Args.size(); ++I)
+    if (Args[I] != "--all" || Select.size() > 1) throw EUsageError(sUnknownOption, Args[I], "flip", "flip");
+  Steps.push_back(Select.size() > 1 ? std::vector<String>{"flip"} : std::vector<String>{"flip", "all"});
+  ChangeModule(Args[0], Steps, Out);
+}
+
+void Revert(const std::vector<String>& Args, std::ostream& Out) {
+  std::vector<String> Select = WordsUpToOption("select", Args, 1);
+  std::vector<String> Step{"revert"};
+  for (std::size_t I = Select.size(); I < Args.size(); ++I) {
+    if (Args[I] != "--yes" && Args[I] != "--no") throw EUsageError(sUnknownOption, Args[I], "revert", "revert");
+    Step.resize(1);
+    Step.push_back(Args[I].substr(2));
+  }
+  if (Select.size() < 2) throw EUsageError(sMissingArguments, "revert", "FILE NAME...", "revert");
+  ChangeModule(Args[0], {Select, Step}, Out);
+}
+
+void Views(const std::vector<String>& Args, std::ostream& Out) {
+  std::vector<std::vector<String>> Steps{{"open", Args[0]}};
+  for (std::size_t I = 1; I < Args.size(); I += 2) {
+    if (Args[I] != "--add" && Args[I] != "--remove") throw EUsageError(sUnknownOption, Args[I], "views", "views");
+    if (I + 1 >= Args.size()) throw EUsageError(sMissingArguments, "views " + Args[I], "a NAME", "views");
+    Steps.push_back({"view", Args[I].substr(2), Args[I + 1]});
+  }
+  if (Steps.size() > 1) Steps.push_back({"save"});
+  Steps.push_back({"views"});
+  RunDesignSteps(Steps, Out);
+}
+
 const std::map<String, TSubcommand>& Subcommands() {
   static const std::map<String, TSubcommand> Table{
+      {"align",
+       {"FILE HOW NAME...",
+        "Lines up the components NAME... (the first one is the anchor) and saves the module.\n"
+        "HOW: left, right, top, bottom, hcenter, vcenter, hspace, vspace, hwincenter,\n"
+        "vwincenter, hspaceinc, hspacedec, hspacedel, vspaceinc, vspacedec, vspacedel,\n"
+        "aligntogrid, snaptogrid, sendtoback, bringtofront.\n",
+        3, Align}},
+      {"size",
+       {"FILE HOW NAME... [--to N]",
+        "Sizes the components NAME... and saves the module. HOW: hgrow, hshrink, habsolute,\n"
+        "vgrow, vshrink, vabsolute (to the size N), widths, heights, widthheight (alike).\n",
+        3, Size}},
+      {"flip",
+       {"FILE [--all | NAME...]",
+        "Mirrors right to left the children of the containers NAME..., or with --all every\n"
+        "control of the form, and saves the module.\n",
+        1, Flip}},
+      {"revert",
+       {"FILE NAME... [--yes|--no]",
+        "Gives the inherited components NAME... back their ancestor's values and saves the\n"
+        "module. Where that deletes a component's own children, --yes goes on, --no leaves\n"
+        "that component out, and without either nothing is reverted.\n",
+        2, Revert}},
+      {"views",
+       {"FILE [--add NAME]... [--remove NAME]...",
+        "Adds and removes views of the module (alternate forms, saved beside it as their\n"
+        "differences: Form1.Phone.kfm), saves it when it changed, and prints its views: name,\n"
+        "device size (a view named after the device Phone, Tablet or Desktop takes its size)\n"
+        "and file, tab-separated.\n",
+        1, Views}},
       {"tree", {"FILE", "Prints the module's components, one a line, each under the one it stands in.\n", 1, Tree}},
       {"props",
        {"FILE NAME",

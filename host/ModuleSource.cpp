@@ -92,6 +92,15 @@ void TModuleSource::SetText(const String& Text, const String& Origin) {
       if (Colon2 == String::npos) throw ESourceFileError(sSourceMalformed, Origin, static_cast<int>(I + 1));
       Read.FFields.emplace_back(Trimmed(Field.substr(0, Colon2)), Trimmed(Field.substr(Colon2 + 1)));
     }
+    for (; I < Lines.size() && StartsWith(Trimmed(Lines[I]), "view "); ++I) {
+      String View = Trimmed(Lines[I]).substr(5);
+      std::size_t Equals = View.find('=');
+      String Name = Trimmed(View.substr(0, Equals));
+      if (Equals == String::npos || !IsValidIdent(Name))
+        throw ESourceFileError(sSourceMalformed, Origin, static_cast<int>(I + 1));
+      String Value = Trimmed(View.substr(Equals + 1));
+      Read.Views.push_back(Name + "=" + (Value.empty() ? String(" ") : Value));
+    }
   }
   Read.FMethods = ParseMethods(Lines, I, Origin);
   *this = std::move(Read);
@@ -102,6 +111,7 @@ String TModuleSource::Text() const {
   if (!ClassName.empty()) {
     Out += "class " + ClassName + (AncestorClass.empty() ? String() : " : " + AncestorClass) + "\n";
     for (const auto& [Name, Class] : FFields) Out += "  field " + Name + ": " + Class + "\n";
+    for (const String& View : Views) Out += "  view " + Trimmed(View) + "\n";
   }
   for (const TSourceMethod& M : FMethods) Out += MethodText(M.Name);
   return Out;

@@ -11,6 +11,7 @@
 //
 //   class TForm2 : TForm1
 //     field Edit2: TEdit
+//     view Phone=360x640
 //   handler Button1Click(Sender: TObject)
 //   begin
 //   end
@@ -47,6 +48,9 @@ public:
   String ClassName;
   /// The class it descends from ("TForm" for a form of its own, "TForm1" for a descendant).
   String AncestorClass;
+  /// The module's views, lines "Name=Value" in their order; Value is the device's size,
+  /// or a single blank.
+  std::vector<String> Views;
 
   // Reading and writing -------------------------------------------------------------
   /// Reads `Path`; a file that does not exist gives an empty source. Raises

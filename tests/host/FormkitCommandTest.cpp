@@ -198,3 +198,88 @@ TEST_F(FormkitCommandTest, BadInputIsRefusedWithOneMessageAndNoFileChanges) {
 }
 
 } // namespace
+
+//===----------------------------------------------------------------------===//
+// Positioning and views
+//===----------------------------------------------------------------------===//
+
+namespace {
+
+struct ArrangeCommandTest : FormkitCommandTest {
+  /// What `props` shows for `Component`.`Property` of `File`.
+  String Prop(const String& File, const String& Component, const String& Property) {
+    EXPECT_EQ(Run({"props", At(File), Component}), feOK) << Err.str();
+    std::istringstream Lines(Out.str());
+    for (String Line; std::getline(Lines, Line);) {
+      if (Line.rfind(Property + "\t", 0) != 0) continue;
+      String Rest = Line.substr(Property.size() + 1);
+      return Rest.substr(0, Rest.find('\t'));
+    }
+    return "?";
+  }
+};
+
+TEST_F(ArrangeCommandTest, AlignSizeFlipAndRevertChangeTheModuleAndSaveIt) {
+  // Button2 (384, 280) is the anchor: Button1 (296, 280) moves to its left edge.
+  ASSERT_EQ(Run({"align", At("Form1.kfm"), "left", "Button2", "Button1"}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form1.kfm", "Button1", "Left"), "384");
+  ASSERT_EQ(Run({"size", At("Form1.kfm"), "habsolute", "Button1", "Button2", "--to", "90"}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form1.kfm", "Button1", "Width"), "90");
+  EXPECT_EQ(Prop("Form1.kfm", "Button2", "Width"), "90");
+  // Mirrored in the form's client width of 480.
+  ASSERT_EQ(Run({"flip", At("Form1.kfm"), "--all"}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form1.kfm", "Button1", "Left"), "6");
+
+  // An inherited component given back its ancestor's caption.
+  String Inherited = Prop("Form1.kfm", "Button2", "Caption");
+  ASSERT_EQ(Run({"set", At("Form2.kfm"), "Button2.Caption", "Mine"}), feOK) << Err.str();
+  ASSERT_EQ(Run({"revert", At("Form2.kfm"), "Button2"}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form2.kfm", "Button2", "Caption"), Inherited);
+
+  // Refused: nothing changes, with the message and the exit code.
+  std::map<String, String> Before = Files();
+  EXPECT_EQ(Run({"align", At("Form1.kfm"), "sideways", "Button1", "Button2"}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit align: unknown way 'sideways'\n");
+  EXPECT_EQ(Run({"align", At("Form1.kfm"), "left", "Button1", "Nobody"}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit align: Module Form1 has no component named 'Nobody'\n");
+  EXPECT_EQ(Run({"size", At("Form1.kfm"), "habsolute", "Button1", "--to"}), feUsage);
+  EXPECT_EQ(Run({"flip", At("Form1.kfm"), "Panel1", "--all"}), feUsage);
+  EXPECT_EQ(Err.str(), "Unknown option '--all' of 'formkit flip'. Try 'formkit flip --help'.\n");
+  EXPECT_EQ(Run({"revert", At("Form2.kfm")}), feUsage);
+  EXPECT_EQ(Files(), Before);
+}
+
+TEST_F(ArrangeCommandTest, ViewsAreAddedSavedBesideTheModuleListedAndRemoved) {
+  ASSERT_EQ(Run({"views", At("Form1.kfm"), "--add", "Phone", "--add", "Tall"}), feOK) << Err.str();
+  EXPECT_EQ(Out.str(), "Phone\t360x640\tForm1.Phone.kfm\nTall\t-\tForm1.Tall.kfm\n");
+  EXPECT_TRUE(fs::exists(At("Form1.Phone.kfm")));
+  EXPECT_NE(Read(At("Form1.fks")).find("  view Phone=360x640\n  view Tall=\n"), String::npos) << Read(At("Form1.fks"));
+
+  // A script moves a button in one view; the master's edit reaches the view.
+  WriteScript("views.design", "open " + At("Form1.kfm") + "\n"
+                              "view show Tall\n"
+                              "set Button1.Left 10\n"
+                              "view show master\n"
+                              "set Button1.Caption Go\n"
+                              "view show tall\n"
+                              "expect Button1.Caption Go\n"
+                              "save\n");
+  ASSERT_EQ(Run({"run", At("views.design")}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form1.kfm", "Button1", "Left"), "296");
+  EXPECT_EQ(Prop("Form1.kfm", "Button1", "Caption"), "Go");
+
+  std::map<String, String> Before = Files();
+  EXPECT_EQ(Run({"views", At("Form1.kfm"), "--add", "tall"}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit views: View \"tall\" already exists in module\n");
+  EXPECT_EQ(Run({"views", At("Form1.kfm"), "--remove", "Wide"}), feFailed);
+  EXPECT_EQ(Err.str(), "formkit views: View \"Wide\" does not exist in module\n");
+  EXPECT_EQ(Run({"views", At("Form1.kfm"), "--add"}), feUsage);
+  EXPECT_EQ(Files(), Before);
+
+  ASSERT_EQ(Run({"views", At("Form1.kfm"), "--remove", "phone"}), feOK) << Err.str();
+  EXPECT_EQ(Out.str(), "Tall\t-\tForm1.Tall.kfm\n");
+  ASSERT_EQ(Run({"views", At("Form1.kfm")}), feOK) << Err.str();
+  EXPECT_EQ(Out.str(), "Tall\t-\tForm1.Tall.kfm\n");
+}
+
+} // namespace

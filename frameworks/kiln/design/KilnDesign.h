@@ -223,8 +223,9 @@ class FK_API TKilnRoot : public TComponentRoot {
       RedirectLinksAnswer;
   /// The module the links go to instead; empty removes them.
   static inline std::function<String(TComponent* Root, const String& LinkedName)> RedirectTarget;
-  /// Answers whether reverting a component may delete its own children.
-  static inline std::function<TDeleteWarnResult(const String& ComponentName, const String& Names)> DeleteWarningAnswer;
+  /// Answers whether reverting a component may delete its own children; `Question` is
+  /// `sAncestorDeleteWarning` with the component's name and the children's.
+  static inline std::function<TDeleteWarnResult(const String& Question)> DeleteWarningAnswer;
   /// The window that shows the module.
   TCustomForm* DesignWindow() const noexcept { return FWindow; }
 

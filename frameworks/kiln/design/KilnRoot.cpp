@@ -190,7 +190,8 @@ void TKilnRoot::AdjustReadComponent(TComponent* Component, const TRect& Rect, co
 }
 
 TDeleteWarnResult TKilnRoot::AskDeleteWarning(const String& ComponentName, const String& Names) {
-  return DeleteWarningAnswer ? DeleteWarningAnswer(ComponentName, Names) : dwCancel;
+  return DeleteWarningAnswer ? DeleteWarningAnswer(Format(LoadResString(sAncestorDeleteWarning), ComponentName, Names))
+                             : dwCancel;
 }
 
 namespace {

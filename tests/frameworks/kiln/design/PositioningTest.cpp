@@ -190,21 +190,28 @@ TEST_F(PositioningTest, RevertThrowsInheritedComponentsAwayAndTheAncestorBringsT
   EXPECT_TRUE(Heir2->CanRevert());
   // Cancelled on the panel, whose own edit would go: nothing was freed.
   std::vector<String> Asked;
-  TKilnRoot::DeleteWarningAnswer = [&](const String& Name, const String& Names) {
-    Asked.push_back(Name + ": " + Names);
+  TKilnRoot::DeleteWarningAnswer = [&](const String& Question) {
+    Asked.push_back(Question);
     return dwCancel;
   };
   auto Reset = Finally([]() noexcept { TKilnRoot::DeleteWarningAnswer = nullptr; });
   Heir2->Command(dmRevert);
-  EXPECT_EQ(Asked, std::vector<String>{"Panel1: Edit1"});
+  EXPECT_EQ(Asked, std::vector<String>{"Reverting 'Panel1' deletes all contained components not found in the "
+                                       "ancestor and will delete the following: Edit1.  Continue?"});
   EXPECT_EQ(static_cast<TButton*>(Heir->GetRoot()->FindComponent("Button1"))->Caption(), "Mine");
   // Answered no for the panel: only the button goes back to the ancestor's.
-  TKilnRoot::DeleteWarningAnswer = [](const String&, const String&) { return dwNo; };
+  TKilnRoot::DeleteWarningAnswer = [](const String&) { return dwNo; };
   Heir2->Command(dmRevert);
   auto* Again = static_cast<TButton*>(Heir->GetRoot()->FindComponent("Button1"));
   ASSERT_NE(Again, nullptr);
   EXPECT_EQ(Again->Caption(), "Base");
   EXPECT_NE(Heir->GetRoot()->FindComponent("Edit1"), nullptr);
+  // Answered yes: the panel goes back to the ancestor's, without the heir's own edit.
+  TKilnRoot::DeleteWarningAnswer = [](const String&) { return dwYes; };
+  Heir2->SelectComponent(Heir->GetRoot()->FindComponent("Panel1"));
+  Heir2->Command(dmRevert);
+  EXPECT_NE(Heir->GetRoot()->FindComponent("Panel1"), nullptr);
+  EXPECT_EQ(Heir->GetRoot()->FindComponent("Edit1"), nullptr);
   // The ancestor module itself has nothing inherited to revert.
   Kiln->SelectComponent(A);
   EXPECT_FALSE(Kiln->CanRevert());
