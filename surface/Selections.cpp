@@ -44,6 +44,12 @@ void TSimpleSelections::BeforeDestruction() {
 }
 
 int TSimpleSelections::IndexOf(const IPtr<IItem>& Item) {
+  TPersistent* Persistent = ExtractPersistent(Item);
+  if (Persistent && FOtherCount == 0) {
+    if (!FPersistentCounts.count(Persistent)) return -1;
+    auto It = std::find(FPersistents.begin(), FPersistents.end(), Persistent);
+    return static_cast<int>(It - FPersistents.begin());
+  }
   for (size_t I = 0; I < FList.size(); ++I)
     if (SameItem(FList[I], Item)) return static_cast<int>(I);
   return -1;
@@ -55,9 +61,27 @@ IPtr<IItem> TSimpleSelections::GetItems(int Index) {
   return FList[Index];
 }
 
+void TSimpleSelections::Insert(const IPtr<IItem>& Item) {
+  TPersistent* Persistent = ExtractPersistent(Item);
+  FList.push_back(Item);
+  FPersistents.push_back(Persistent);
+  if (Persistent) ++FPersistentCounts[Persistent];
+  else ++FOtherCount;
+}
+
+void TSimpleSelections::Forget(std::size_t Index) {
+  if (TPersistent* Persistent = FPersistents[Index]) {
+    if (--FPersistentCounts[Persistent] == 0) FPersistentCounts.erase(Persistent);
+  } else {
+    --FOtherCount;
+  }
+  FList.erase(FList.begin() + static_cast<std::ptrdiff_t>(Index));
+  FPersistents.erase(FPersistents.begin() + static_cast<std::ptrdiff_t>(Index));
+}
+
 void TSimpleSelections::Add(const IPtr<IItem>& Item) {
   if (IndexOf(Item) >= 0) return;
-  FList.push_back(Item);
+  Insert(Item);
   Modified();
 }
 
@@ -69,12 +93,15 @@ void TSimpleSelections::Remove(const IPtr<IItem>& Item) {
 void TSimpleSelections::Remove(int Index) {
   if (FList.empty()) return;
   if (Index < 0 || Index >= GetCount()) throw EListError(SSelectionIndexError, Index);
-  FList.erase(FList.begin() + Index);
+  Forget(static_cast<std::size_t>(Index));
   Modified();
 }
 
 void TSimpleSelections::Clear() {
   FList.clear();
+  FPersistents.clear();
+  FPersistentCounts.clear();
+  FOtherCount = 0;
   Modified();
 }
 

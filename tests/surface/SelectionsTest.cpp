@@ -113,6 +113,35 @@ TEST_F(SelectionsTest, AddKeepsOnePlacePerItemAndNotifiesOnlyOnChange) {
   EXPECT_EQ(L->Counts.size(), 2u);
 }
 
+/// An item of another kind that says it is the same as every item.
+class TWildcardItem : public TBareItem {
+  FK_CLASS(TWildcardItem, TBareItem)
+  bool Equals(const IPtr<IItem>&) override { return true; }
+};
+FK_IMPLEMENT(TWildcardItem, "Tests") {}
+
+TEST_F(SelectionsTest, AnItemOfAnotherKindIsStillAskedWhetherItIsTheSame) {
+  // Only persistent items at first: found by what they stand for, wherever they are.
+  Sel->Add(S->ItemOf(A));
+  Sel->Add(S->ItemOf(B));
+  Sel->Add(S->ItemOf(C));
+  auto* List = static_cast<TSimpleSelections*>(QueryAs<ISelections>(Sel).Get());
+  EXPECT_EQ(List->IndexOf(S->ItemOf(C)), 2);
+  Sel->Remove(0);
+  EXPECT_EQ(List->IndexOf(S->ItemOf(A)), -1);
+  EXPECT_EQ(List->IndexOf(S->ItemOf(C)), 1);
+  // An item of another kind in the list answers for itself: it claims every item.
+  IPtr<TWildcardItem> Wild = New<TWildcardItem>();
+  Sel->Add(IPtr<IItem>(static_cast<IItem*>(static_cast<IItemEx*>(Wild.Get()))));
+  EXPECT_EQ(List->IndexOf(S->ItemOf(A)), 2);
+  Sel->Add(S->ItemOf(A)); // taken for the wildcard: not added again
+  EXPECT_EQ(Sel->GetCount(), 3);
+  Sel->Remove(2);
+  EXPECT_EQ(List->IndexOf(S->ItemOf(A)), -1);
+  Sel->Clear();
+  EXPECT_EQ(List->IndexOf(S->ItemOf(B)), -1);
+}
+
 TEST_F(SelectionsTest, BatchesNotifyOnceAtTheOuterEnd) {
   Sel->BeginSelections();
   Sel->BeginSelections();
