@@ -346,6 +346,15 @@ void TUpdateManager::BeforeDestruction() {
   inherited::BeforeDestruction();
 }
 
+void TUpdateManager::JoinAncestor(TComponent* Ancestor, const IPtr<IUpdateManager>& AncestorManager) {
+  TUpdateManager* Parent = ManagerOf(QueryAs<IInterface>(AncestorManager));
+  if (FParent || FAncestor || !Parent || !Ancestor) return;
+  FComponentUpdate = std::make_unique<TUpdateObject>(nullptr, FComponent, Ancestor, nullptr, true, true);
+  FAncestor = Ancestor;
+  FParent = Parent;
+  FParent->FChildList.push_back(this);
+}
+
 TUpdateManager* TUpdateManager::ManagerOf(const IPtr<IInterface>& Manager) {
   IPtr<IImplementation> Impl = QueryAs<IImplementation>(Manager);
   return Impl ? dynamic_cast<TUpdateManager*>(Impl->GetInstance()) : nullptr;
@@ -593,6 +602,10 @@ void InstallUpdateManagerHooks() {
                                        const IPtr<IUpdateManager>& AncestorManager) {
     return NewAs<IUpdateManager, TUpdateManager>(Component, Ancestor, AncestorManager, NewRootUpdateCallback(Root));
   };
+  TRootHooks::UpdateManagerJoinAncestor = [](const IPtr<IUpdateManager>& M, TComponent* Ancestor,
+                                             const IPtr<IUpdateManager>& AncestorManager) {
+    if (TUpdateManager* Found = Manager(M)) Found->JoinAncestor(Ancestor, AncestorManager);
+  };
   TRootHooks::UpdateManagerModified = [](const IPtr<IUpdateManager>& M) {
     if (TUpdateManager* Found = Manager(M)) Found->Modified();
   };
@@ -631,6 +644,7 @@ void InstallUpdateManagerHooks() {
 
 void RemoveUpdateManagerHooks() {
   TRootHooks::CreateUpdateManager = nullptr;
+  TRootHooks::UpdateManagerJoinAncestor = nullptr;
   TRootHooks::UpdateManagerModified = nullptr;
   TRootHooks::UpdateManagerUpdate = nullptr;
   TRootHooks::UpdateManagerRemoved = nullptr;

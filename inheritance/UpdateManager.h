@@ -86,6 +86,10 @@ class FK_API TUpdateManager : public TInterfacedObject,
                  const IPtr<IUpdateManagerCallback>& Notifier);
   /// Leaves the family: the descendants lose their parent and stay usable.
   void BeforeDestruction() override;
+  /// Takes `Ancestor`, managed by `AncestorManager`, as the ancestor again after the
+  /// ancestor's module came back from dormancy: the component it followed was replaced
+  /// by the same one read from the stream. Nothing when this manager follows another.
+  void JoinAncestor(TComponent* Ancestor, const IPtr<IUpdateManager>& AncestorManager);
 
   /// The manager behind an interface reference, or null when it is not one of these.
   [[nodiscard]] static TUpdateManager* ManagerOf(const IPtr<IInterface>& Manager);

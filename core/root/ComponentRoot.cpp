@@ -39,6 +39,8 @@ std::function<void(TComponent*, TClass)> TRootHooks::ChangeToProxyClass;
 std::function<void(TComponentRoot&, TComponent*)> TRootHooks::ValidateInheritence;
 std::function<void(TComponentRoot&, TComponent*, const TGetStrProc&)> TRootHooks::SelectionEditorUnits;
 std::function<void(const IPtr<IUpdateManager>&)> TRootHooks::UpdateManagerUpdate;
+std::function<void(const IPtr<IUpdateManager>&, TComponent*, const IPtr<IUpdateManager>&)>
+    TRootHooks::UpdateManagerJoinAncestor;
 std::function<void(const String&)> TRootHooks::SendDesignerCommand;
 
 void RaiseServiceNotAvailable(const char* Service) { throw EComponentDesignerException(sServiceNotAvailable, Service); }

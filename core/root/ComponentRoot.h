@@ -718,6 +718,8 @@ private:
   int InternalAddView(const String& Name, bool Existing, const IPtr<IDatedStream>& Stream);
   /// The view list of the module record in a new string list.
   [[nodiscard]] TObjectGuard<TStringList> FetchViewList();
+  /// The open descendants of a module back from dormancy follow its new root component.
+  void RejoinDescendants();
   /// The last step of every creation: selects `Component`, shows it, marks the change.
   TComponent* SelectCreated(TComponent* Component);
   /// The root whose window a master shows: its active view, or itself.

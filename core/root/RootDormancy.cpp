@@ -47,7 +47,18 @@ void TComponentRoot::Resurrect() {
     ResurrectDependentModules(FRoot);
   }
   FreeAndNil(FDormantStream);
+  RejoinDescendants();
   if (FModule && (!FAncestorRoot || FAncestorRoot->GetModule() != FModule)) FModule->ModuleResurrected();
+}
+
+void TComponentRoot::RejoinDescendants() {
+  if (!TRootHooks::UpdateManagerJoinAncestor || !FRootUpdateManager) return;
+  for (int I = 0, N = FDesigner->GetRootsCount(); I < N; ++I) {
+    auto Root = QueryAs<IInternalRoot>(FDesigner->GetRoots(I));
+    auto Ancestor = Root ? QueryAs<IInternalRoot>(Root->GetAncestorRoot()) : nullptr;
+    if (Ancestor && Ancestor->Implementor() == this && Root->GetUpdateManager())
+      TRootHooks::UpdateManagerJoinAncestor(Root->GetUpdateManager(), FRoot, FRootUpdateManager);
+  }
 }
 
 void TComponentRoot::ResurrectDependentModules(TComponent* Root) {

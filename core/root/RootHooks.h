@@ -32,6 +32,11 @@ struct FK_API TRootHooks {
                                             const IPtr<IUpdateManager>& AncestorManager)>
       CreateUpdateManager;
   /// Tells an update manager of a change (`Modified`) or of a removed instance.
+  /// Makes `Manager`, whose ancestor went dormant, follow `Ancestor` (managed by
+  /// `AncestorManager`), the same component read back from the ancestor's stream.
+  static std::function<void(const IPtr<IUpdateManager>& Manager, TComponent* Ancestor,
+                            const IPtr<IUpdateManager>& AncestorManager)>
+      UpdateManagerJoinAncestor;
   static std::function<void(const IPtr<IUpdateManager>& Manager)> UpdateManagerModified;
   static std::function<void(const IPtr<IUpdateManager>& Manager, TPersistent* Instance)> UpdateManagerRemoved;
   /// True when a name is taken in the module or one of its descendants.

@@ -76,6 +76,35 @@ TEST_F(DormancyTest, ADormantModuleKeepsItsNameAndStreamAndComesBackAsItWas) {
   EXPECT_NE(Form->GetRoot(), nullptr);
 }
 
+TEST_F(DormancyTest, AnAncestorWithHandlersSleepsAndWakesAndItsDescendantStillFollowsIt) {
+  auto* Button = static_cast<TButton*>(Form->GetRoot()->FindComponent("Button1"));
+  Button->OnClick = TNotifyEvent(QueryAs<IDesigner>(Form)->CreateMethod("Button1Click", IPtr<IEventInfo>()));
+  KilnRoot(Form)->Modified();
+  IPtr<IRoot> Heir = NewDescendant("Form2", "Form1");
+  std::vector<std::uint8_t> Stream = BytesOf(Form->FormFileOpen());
+
+  Form->GoDormant();
+  ASSERT_NE(Heir->GetRoot(), nullptr) << "the descendant stays open";
+  QueryAs<IInternalRoot>(Form)->Resurrect();
+  EXPECT_EQ(BytesOf(Form->FormFileOpen()), Stream);
+  Button = static_cast<TButton*>(Form->GetRoot()->FindComponent("Button1"));
+  ASSERT_NE(Button, nullptr);
+  EXPECT_EQ(QueryAs<IDesigner>(Form)->GetMethodName(Button->OnClick.Method()), "Button1Click");
+  // The same selection rules: a component selects, the root is the selection when none is.
+  KilnRoot(Form)->SelectComponent(Button);
+  EXPECT_EQ(KilnRoot(Form)->GetSelection()->Get(0), Button);
+  KilnRoot(Form)->ClearSelection();
+  EXPECT_EQ(KilnRoot(Form)->GetSelection()->Get(0), Form->GetRoot());
+
+  // The descendant follows the woken ancestor.
+  Button->SetLeft(120);
+  KilnRoot(Form)->Modified();
+  auto* Inherited = static_cast<TButton*>(Heir->GetRoot()->FindComponent("Button1"));
+  ASSERT_NE(Inherited, nullptr);
+  EXPECT_EQ(Inherited->Left(), 120);
+  EXPECT_TRUE(Inherited->ComponentState().Contains(csAncestor));
+}
+
 TEST_F(DormancyTest, AFailedReturnLeavesTheModuleDormantWithItsStream) {
   RegisterClass(TRareButton::StaticClass());
   auto Unregister = Finally([]() noexcept { UnRegisterClass(TRareButton::StaticClass()); });
