@@ -3,6 +3,8 @@
 
 #include "core/DesignIntfClasses.h"
 #include "core/Designers.h"
+#include "core/root/ComponentRoot.h"
+#include "platform/Filer.h"
 
 #include <algorithm>
 
@@ -123,6 +125,64 @@ void TDesignWindow::SetSelection(const IPtr<IDesignerSelections>& ASelection) {
 }
 
 String TDesignWindow::UniqueName(TComponent* AComponent) { return FDesigner->UniqueName(AComponent->ClassName()); }
+
+//===----------------------------------------------------------------------===//
+// The clipboard
+//===----------------------------------------------------------------------===//
+
+TComponentRoot* TDesignWindow::DesignRoot() const {
+  auto Internal = QueryAs<IInternalRoot>(FDesigner);
+  auto* Root = Internal ? dynamic_cast<TComponentRoot*>(Internal->Implementor()) : nullptr;
+  if (!Root) throw EInvalidOperation(sDesignWindowNoModule);
+  return Root;
+}
+
+bool TDesignWindow::ClipboardComponents() noexcept {
+  try {
+    TDesignClipboard& Board = DesignRoot()->Clipboard();
+    return Board.HasFormat(CF_COMPONENTS_NAME) || (Board.HasText() && TComponentRoot::PossibleStream(Board.GetText()));
+  } catch (...) {
+    return false;
+  }
+}
+
+void TDesignWindow::CopyComponents(TComponent* ARoot, const IPtr<IDesignerSelections>& ASelection) {
+  TComponentRoot* Module = DesignRoot();
+  TObjectGuard<TMemoryStream> Stream(new TMemoryStream);
+  {
+    TObjectGuard<TWriter> Writer(new TWriter(Stream.Get(), 1024));
+    Writer->SetRoot(ARoot);
+    for (int I = 0; ASelection && I < ASelection->GetCount(); ++I)
+      if (auto* Component = dynamic_cast<TComponent*>(ASelection->Get(I))) {
+        Writer->WriteSignature();
+        Writer->WriteComponent(Component);
+      }
+    Writer->WriteValue(vaNull);
+  } // freeing the writer flushes its buffer
+  Module->CopyStreamToClipboard(Stream.Get());
+}
+
+void TDesignWindow::PasteComponents(TComponent* AOwner, TComponent* AParent,
+                                    const IPtr<IDesignerSelections>& ASelection) {
+  TObjectGuard<TMemoryStream> Stream(DesignRoot()->GetClipboardStream());
+  TObjectGuard<TReader> Reader(new TReader(Stream.Get(), 1024));
+  Reader->OnSetName = TSetNameEvent::Bind<&TDesignWindow::ReaderSetName>(this);
+  FOwner = AOwner;
+  FSelection = ASelection;
+  auto Forget = Finally([this]() noexcept {
+    FOwner = nullptr;
+    FSelection = nullptr;
+  });
+  Reader->ReadComponents(AOwner, AParent, [this](TComponent* C) { ComponentRead(C); });
+}
+
+void TDesignWindow::ReaderSetName(TReader* AReader, TComponent* AComponent, String& AName) {
+  if (AReader->Root() == FOwner && FOwner && FOwner->FindComponent(AName)) AName = UniqueName(AComponent);
+}
+
+void TDesignWindow::ComponentRead(TComponent* AComponent) {
+  if (FSelection) FSelection->Add(AComponent);
+}
 
 //===----------------------------------------------------------------------===//
 // Positions

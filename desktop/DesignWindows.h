@@ -7,13 +7,16 @@
 // Such windows keep their position in the host's settings between sessions:
 // one owned by another form relative to that form's client area, so that it
 // moves with its owner; any other relative to its monitor, with the monitor's
-// number. Sizes are stored at the default resolution.
+// number. Sizes are stored at the default resolution. Components travel between
+// such windows and modules over the clipboard of the module's framework, in the
+// design core's component format with their text beside it.
 //
 // Example:
 //   auto* Editor = CreateComponentOf<TCollectionEditorWindow>(Application());
 //   Editor->SetDesigner(Designer);    // placed below the main window
 //   LoadFormPos(Settings, "Collection Editor\\TListColumns", Editor);
-//   ...
+//   Editor->CopyComponents(Root, Selection);
+//   if (Editor->ClipboardComponents()) Editor->PasteComponents(Other, Other, Pasted);
 //   SaveFormPos(Settings, "Collection Editor\\TListColumns", Editor);
 //
 //===----------------------------------------------------------------------===//
@@ -24,7 +27,10 @@
 
 namespace formkit {
 
+class TComponentRoot;
 class TDesignWindowLink;
+
+FK_RESOURCESTRING(sDesignWindowNoModule, "The window serves no module on design, so it has no clipboard");
 
 //===----------------------------------------------------------------------===//
 // TDesignWindow
@@ -73,10 +79,34 @@ class FK_API TDesignWindow : public TForm, public IEditHandler {
   /// A name for a new component that its module does not use yet.
   virtual String UniqueName(TComponent* AComponent);
 
+  // The clipboard ----------------------------------------------------------------
+  /// Whether the clipboard holds components: in their own format, or as text that may
+  /// be a component stream. Any failure on the way, a window without a module among
+  /// them, answers false.
+  [[nodiscard]] bool ClipboardComponents() noexcept;
+  /// Puts the components of `ASelection` (other persistents are left out), written
+  /// against `ARoot`, on the clipboard as component data and as text. Raises
+  /// `EInvalidOperation` `sDesignWindowNoModule` when the window serves no module, and
+  /// then the clipboard stays as it was.
+  void CopyComponents(TComponent* ARoot, const IPtr<IDesignerSelections>& ASelection);
+  /// Reads the clipboard's components into `AOwner` under `AParent`; one whose name
+  /// `AOwner` uses already gets `UniqueName`. Each component read is added to
+  /// `ASelection`. Text that is no component stream reads nothing. Raises as
+  /// `CopyComponents` does, and the reader's errors; what was read before an error stays.
+  void PasteComponents(TComponent* AOwner, TComponent* AParent, const IPtr<IDesignerSelections>& ASelection);
+
 protected:
   void WndProc(TMessage& Message) override;
 
 private:
+  /// The module on design the window serves, whose framework supplies the clipboard.
+  TComponentRoot* DesignRoot() const;
+  void ReaderSetName(TReader* AReader, TComponent* AComponent, String& AName);
+  void ComponentRead(TComponent* AComponent);
+
+  /// The list and the owner of the paste that runs; set only during `PasteComponents`.
+  IPtr<IDesignerSelections> FSelection;
+  TComponent* FOwner = nullptr;
   IPtr<IDesigner> FDesigner;
   IPtr<IComponentDesigner> FComponentDesigner;
   bool FActive = false;

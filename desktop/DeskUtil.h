@@ -41,13 +41,14 @@ using TSaveDesktopProc = void (*)(TCustomIniFile* Desktop, bool AIsProject);
 // Starting and stopping
 //===----------------------------------------------------------------------===//
 
-/// Installs the focus hook that `GetTopWindow` reads. Calls nest.
 /// The pieces of `Text` between commas, empty ones included ("a,,b" gives three).
 [[nodiscard]] FK_API std::vector<String> SplitAtCommas(const String& Text);
 
+/// Installs the focus hook that `GetTopWindow` reads and registers the tab and join
+/// hosts (`RegisterDockHostForms`). Calls nest.
 FK_API void InitializeDesktop();
-/// On the last matching call: removes the hook and frees the tables of design forms and
-/// default forms with their events.
+/// On the last matching call: removes the hook, unregisters the hosts and frees the
+/// tables of design forms and default forms with their events.
 FK_API void FinalizeDesktop();
 
 //===----------------------------------------------------------------------===//

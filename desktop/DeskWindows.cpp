@@ -1,5 +1,6 @@
 //===- desktop/DeskWindows.cpp - Showing, focusing and hiding windows ----===//
 #include "desktop/DeskForm.h"
+#include "desktop/DockHostForms.h"
 
 #include <algorithm>
 #include <memory>
@@ -90,6 +91,8 @@ std::vector<String> SplitAtCommas(const String& Text) {
 
 void InitializeDesktop() {
   if (GDesktopStarts++ > 0) return;
+  // Drops make tab and join hosts, and a desktop may name the host class, from the start.
+  RegisterDockHostForms();
   FocusHook = [](TCustomForm* Form) {
     if (Form != Application()->MainForm()) GLastFocusedForm = Form;
   };
@@ -99,6 +102,7 @@ void FinalizeDesktop() {
   if (GDesktopStarts == 0 || --GDesktopStarts > 0) return;
   FocusHook = nullptr;
   GLastFocusedForm = nullptr;
+  UnregisterDockHostForms();
   FreeAndNil(TablesInstance());
 }
 

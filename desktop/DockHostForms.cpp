@@ -54,7 +54,18 @@ bool TBaseDockHostForm::CreateDockParent(TDragDockObject*, std::intptr_t&) { ret
 
 void TBaseDockHostForm::SetDockable(bool) {}
 
+TClass TBaseDockHostForm::GetDialogCharParentClass() const { return TDockableForm::StaticClass(); }
+
 TWinControl* TBaseDockHostForm::GetDockSiteControl() { return this; }
+
+void TBaseDockHostForm::CMDialogChar(TMessage& Message) {
+  TWinControl* Target = this;
+  TControl* Focus = GetFocus();
+  if (Focus && Focus != this && Focus->HasAncestor(this))
+    for (TControl* C = Focus; C && C != this; C = C->Parent())
+      if (auto* W = dynamic_cast<TWinControl*>(C); W && W->InheritsFrom(GetDialogCharParentClass())) Target = W;
+  Target->Broadcast(Message);
+}
 
 void TBaseDockHostForm::ManualDockClient(TControl* AClient, TControl* ADropControl, TAlign ADropAlign,
                                          bool AIncrement) {
@@ -158,6 +169,7 @@ void TBaseDockHostForm::WndProc(TMessage& Message) {
   switch (Message.Msg) {
   case formkit::UMFinalUndock: UMFinalUndock(reinterpret_cast<TControl*>(Message.LParam)); return;
   case formkit::UMNewClientFocused: UMNewClientFocused(reinterpret_cast<TControl*>(Message.LParam)); return;
+  case CM_DIALOGCHAR: CMDialogChar(Message); return;
   default: inherited::WndProc(Message);
   }
 }

@@ -8,7 +8,7 @@
 // `UMFinalUndock` puts that client in the host's place and frees the host.
 //
 // Example:
-//   RegisterDockHostForms();             // drops now make these hosts
+//   InitializeDesktop();                 // drops now make these hosts
 //   TDockDrag Drag(Watches);
 //   Drag.MoveTo(Center(Messages));
 //   Drag.Drop();                         // a tab host with both
@@ -32,8 +32,9 @@ namespace formkit {
 enum : std::uint32_t {
   /// Sent to a host when one of its clients got the focus; the argument is the client.
   UMNewClientFocused = 1287,
-  /// The framework's message to a client that lost its place as the focused client.
-  CMDockClientDeactivate = 45057,
+  /// The framework's message to a client that lost its place as the focused client
+  /// (a number of the framework's own list, so that it meets no other message).
+  CMDockClientDeactivate = CM_DEACTIVATE,
 };
 
 class TBaseDockHostForm;
@@ -48,7 +49,8 @@ FK_API bool CanTakeFocus(const TControl* C);
 FK_API std::vector<TBaseDockHostForm*>& HostDockFormList();
 
 /// Makes drops create `TTabDockHostForm` and `TJoinDockForm`, and registers the host
-/// class for the desktop section "DockSite". `UnregisterDockHostForms` undoes it.
+/// class for the desktop section "DockSite"; `InitializeDesktop` calls it.
+/// `UnregisterDockHostForms` undoes it.
 FK_API void RegisterDockHostForms();
 FK_API void UnregisterDockHostForms();
 
@@ -75,6 +77,9 @@ public:
   bool CreateDockParent(TDragDockObject* Source, std::intptr_t& Result) override;
   /// A host is always dockable.
   void SetDockable(bool AValue) override;
+  /// The class at which the walk of a dialog character up from the focused control
+  /// stops: a client window of the host.
+  virtual TClass GetDialogCharParentClass() const;
   /// The control clients dock into: the form itself.
   virtual TWinControl* GetDockSiteControl();
   /// With `AIncrement`, `AClient` takes the place of `ADropControl`; otherwise it docks
@@ -101,6 +106,10 @@ protected:
   virtual void UMFinalUndock(TControl* AClient);
   /// Tells the previously focused client, when it differs, that it lost its place.
   void UMNewClientFocused(TControl* AClient);
+  /// Hands a dialog character to the client window that holds the focus (the outermost
+  /// control of class `GetDialogCharParentClass` around it, below the host), or to all
+  /// clients when the focus is elsewhere, until one takes it.
+  virtual void CMDialogChar(TMessage& Message);
   /// Posts `UMFinalUndock` once; later requests wait for it.
   void PostFinalUndock(TControl* AClient);
   /// Whether `UMFinalUndock` is moving the last client out.
@@ -230,6 +239,8 @@ public:
   /// Visibility of a client: a tab comes or goes with it. Its caption: the tab's text,
   /// and the host's when the tab is selected.
   void CMDockNotification(TControl* Client, TDockNotifyKind Kind) override;
+  /// Passes a dialog character to the page area, where the client in front takes it.
+  void CMDialogChar(TMessage& Message) override;
   /// `ASection` names a client here: `ANewClient` takes its tab and page, and it moves
   /// to `ANewHost`; false when it is no client of this host.
   bool DockReplaceDockClient(TControl* AClient, TWinControl* ANewHost, TControl* ANewClient);
@@ -240,6 +251,9 @@ public:
   /// Docks the clients named by "TabDockClients" and selects "ActiveTabID" (or the
   /// older "ActiveTab"); aborts silently without clients.
   void LoadWindowState(TCustomIniFile* ADesktop) override;
+  /// Leaves the batch, then brings the selected tab's page forward: tab clicks of a
+  /// floating host wait while it is in the batch of a desktop load.
+  void UnlockUpdates() override;
 
 private:
   friend class TTabDockInfo;

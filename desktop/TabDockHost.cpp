@@ -288,6 +288,15 @@ void TTabDockHostForm::DockTabClick(TObject*) {
   ResetCaption();
 }
 
+void TTabDockHostForm::CMDialogChar(TMessage& Message) {
+  Message.Result = SendMessage(FDockPanel, Message.Msg, Message.WParam, Message.LParam);
+}
+
+void TTabDockHostForm::UnlockUpdates() {
+  inherited::UnlockUpdates();
+  if (!FDestroying) DockTabClick(this);
+}
+
 void TTabDockHostForm::DockTabMouseDown(TMouseButton Button, TPoint P) {
   FDownDockInfo = nullptr;
   FDownPos = P;

@@ -4,6 +4,7 @@
 #include "core/DesignIntfClasses.h"
 #include "host/DesignHost.h"
 #include "host/DesignScript.h"
+#include "host/DesktopRender.h"
 #include "host/FormRender.h"
 #include "platform/TypInfo.h"
 
@@ -41,6 +42,8 @@ const char* const MainHelp =
     "  revert FILE NAME... [--yes|--no]  gives inherited components their ancestor's values\n"
     "  views FILE [--add NAME]... [--remove NAME]...\n"
     "                                 lists, adds and removes the module's views\n"
+    "  desktop render FILE OUT.png [--monitors SPEC]\n"
+    "                                 draws the layout a desktop file saves\n"
     "\n"
     "'formkit SUBCOMMAND --help' tells more of each.\n"
     "\n"
@@ -267,6 +270,15 @@ const std::map<String, TSubcommand>& Subcommands() {
         "Draws the module at its own size into a PNG or an SVG file, the named components\n"
         "selected with their grab handles.\n",
         2, Render}},
+      {"desktop",
+       {"render FILE OUT.png|OUT.svg [--monitors SPEC]", DESKTOP_COMMAND_HELP, 3,
+        [](const std::vector<String>& Args, std::ostream& Out) {
+          try {
+            RunDesktopCommand(Args, Out);
+          } catch (const EDesktopUsageError& E) {
+            throw EUsageError(E.Message());
+          }
+        }}},
   };
   return Table;
 }

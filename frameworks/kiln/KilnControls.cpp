@@ -509,7 +509,17 @@ void TWinControl::WndProc(TMessage& Message) {
     ControlChange(reinterpret_cast<TControl*>(Message.WParam), Message.LParam != 0);
     return;
   }
+  if (Message.Msg == CM_DIALOGCHAR) {
+    Broadcast(Message);
+    return;
+  }
   inherited::WndProc(Message);
+}
+
+void TWinControl::Broadcast(TMessage& Message) {
+  // A copy: a child that acts may change the list.
+  for (TControl* C : std::vector<TControl*>(FControls))
+    if ((Message.Result = SendMessage(C, Message.Msg, Message.WParam, Message.LParam)) != 0) return;
 }
 
 void TWinControl::Resized() {

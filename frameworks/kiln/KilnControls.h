@@ -271,6 +271,9 @@ class FK_API TWinControl : public TControl {
   void SetChildZOrder(TControl* Child, int Position);
   void BringToFront(TControl* Child) { SetChildZOrder(Child, ControlCount() - 1); }
   void SendToBack(TControl* Child) { SetChildZOrder(Child, 0); }
+  /// Sends `Message` to each child, first to last, until one answers (a `Result` other
+  /// than 0).
+  void Broadcast(TMessage& Message);
 
   // Tab order ---------------------------------------------------------------
   /// The position among the parent's windowed children in tab order; -1 without parent.

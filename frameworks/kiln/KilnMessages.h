@@ -56,6 +56,11 @@ enum : std::uint32_t {
   /// To a form: destroy yourself (posted by `ReleaseForm`).
   CM_RELEASE = CM_BASE + 9,
   CM_SHOWINGCHANGED = CM_BASE + 10,
+  /// A key typed with Alt, as a dialog character (WParam the character): a control whose
+  /// accelerator it is acts and answers 1; a windowed control passes it to its children.
+  CM_DIALOGCHAR = CM_BASE + 11,
+  /// To a control: it is no longer the one that is active among its siblings.
+  CM_DEACTIVATE = CM_BASE + 12,
 };
 
 /// Anything that can receive messages. A target must call `RemoveMessages(this)` in its

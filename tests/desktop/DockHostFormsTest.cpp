@@ -3,6 +3,8 @@
 #include "frameworks/kiln/KilnWindows.h"
 #include "tests/desktop/DesktopTestSupport.h"
 
+#include <cctype>
+
 namespace formkit::desktoptest {
 namespace {
 
@@ -24,20 +26,47 @@ class TEditWindow : public TDockableForm {
   FK_CLASS(TEditWindow, TDockableForm)
 };
 
+/// A tool window the registry makes, named and captioned after its section, as a join
+/// host's tree finds its clients by name.
+class TSectionTool : public THostedTool, public IDesktopFormCreator {
+  FK_CLASS(TSectionTool, THostedTool)
+  FK_INTERFACES(IDesktopFormCreator)
+public:
+  void SetDeskSection(const String& ASection) override {
+    THostedTool::SetDeskSection(ASection);
+    SetName(ASection);
+    SetCaption(ASection);
+  }
+};
+
+/// A control that takes the dialog character its caption marks with "&" while it and
+/// every parent are visible.
+class TAccelBox : public TWinControl {
+  FK_CLASS(TAccelBox, TWinControl)
+public:
+  int Taken = 0;
+
+protected:
+  void WndProc(TMessage& Message) override {
+    if (Message.Msg != CM_DIALOGCHAR) return inherited::WndProc(Message);
+    std::size_t Amp = Caption().find('&');
+    bool Mine = Amp + 1 < Caption().size() && std::tolower(static_cast<unsigned char>(Caption()[Amp + 1])) ==
+                                                   std::tolower(static_cast<int>(Message.WParam));
+    for (TControl* C = this; C && Mine; C = C->Parent()) Mine = C->Visible();
+    if (!Mine) return;
+    ++Taken;
+    Message.Result = 1;
+  }
+};
+
 FK_IMPLEMENT(THostedTool, "DockHostFormsTest") {}
 FK_IMPLEMENT(TEditWindow, "DockHostFormsTest") {}
+FK_IMPLEMENT(TSectionTool, "DockHostFormsTest") {}
+FK_IMPLEMENT(TAccelBox, "DockHostFormsTest") {}
 
+/// The hosts come with the desktop's start, which the fixture runs.
 class DockHosts : public DesktopTest {
 protected:
-  void SetUp() override {
-    DesktopTest::SetUp();
-    RegisterDockHostForms();
-  }
-  void TearDown() override {
-    UnregisterDockHostForms();
-    DesktopTest::TearDown();
-  }
-
   THostedTool* Tool(const String& Name, const TRect& R) {
     auto* W = MakeWindow<THostedTool>(Name);
     W->SetName(Name);
@@ -70,6 +99,42 @@ protected:
     return Indexes;
   }
 };
+
+TEST_F(DockHosts, StartingTheDesktopRegistersTheHostsAndStoppingItWithdrawsThem) {
+  EXPECT_EQ(DockHostClass(dtTab), TTabDockHostForm::StaticClass());
+  EXPECT_EQ(DockHostClass(dtJoin), TJoinDockForm::StaticClass());
+  // The registry knows the host class under its section, with no instance of its own.
+  RegisterDesktopFormClass(TBaseDockHostForm::StaticClass(), "Probe", "Probe");
+  EXPECT_EQ(GetInstanceName(TBaseDockHostForm::StaticClass(), "DockSite"), "");
+  EXPECT_EQ(GetInstanceName(TBaseDockHostForm::StaticClass(), String()), "")
+      << "the section \"DockSite\" is registered first, with an empty instance name";
+  UnregisterDesktopFormClass(TBaseDockHostForm::StaticClass());
+  RegisterDesktopFormClass(TBaseDockHostForm::StaticClass(), "Probe", "Probe");
+  EXPECT_EQ(GetInstanceName(TBaseDockHostForm::StaticClass(), String()), "Probe");
+  UnregisterDesktopFormClass(TBaseDockHostForm::StaticClass());
+
+  // A nested start and stop leave them; the last stop withdraws them.
+  InitializeDesktop();
+  FinalizeDesktop();
+  EXPECT_EQ(DockHostClass(dtTab), TTabDockHostForm::StaticClass());
+  FinalizeDesktop();
+  EXPECT_EQ(DockHostClass(dtTab), nullptr);
+  EXPECT_EQ(DockHostClass(dtJoin), nullptr);
+  {
+    THostedTool* Target = Tool("Target", Rect(100, 100, 450, 350));
+    THostedTool* Dragged = Tool("Dragged", Rect(900, 500, 1100, 700));
+    TDockDrag Drag(Dragged);
+    Drag.MoveTo(Point(275, 225));
+    (void)Drag.Drop();
+    EXPECT_EQ(HostDockSite(Target), nullptr) << "without the hosts a drop makes none";
+    EXPECT_TRUE(HostDockFormList().empty());
+  }
+  InitializeDesktop(); // the fixture stops it once more
+  THostedTool* Target = Tool("Target2", Rect(100, 400, 450, 650));
+  THostedTool* Dragged = Tool("Dragged2", Rect(900, 100, 1100, 300));
+  DropAt(Dragged, Point(275, 525));
+  EXPECT_NE(HostOf<TTabDockHostForm>(Target), nullptr);
+}
 
 TEST_F(DockHosts, DropInTheMiddleMakesATabHostThatDissolvesWithOneClientLeft) {
   THostedTool* Target = Tool("Target", Rect(100, 100, 450, 350));
@@ -306,6 +371,145 @@ TEST_F(DockHosts, HostsSaveTheirClientsAndLoadThemBack) {
   Again->Destroy();
 }
 
+TEST_F(DockHosts, ATabHostLoadedInABatchShowsItsActivePageWhenTheBatchEnds) {
+  // The clients first: a host docks the windows the load has made so far.
+  Register(THostedTool::StaticClass(), "Alpha");
+  Register(THostedTool::StaticClass(), "Beta");
+  Register(TTabDockHostForm::StaticClass(), "DockSite0");
+  TObjectGuard<TMemIniFile> Desktop = DesktopOf("[DockSite0]\nCreate=1\nVisible=1\nLeft=1000\nTop=1000\n"
+                                                "Width=2000\nHeight=3000\nTabDockClients=Alpha,Beta\n"
+                                                "ActiveTabID=Alpha\n"
+                                                "[Alpha]\nCreate=1\nVisible=1\nDocked=1\n"
+                                                "[Beta]\nCreate=1\nVisible=1\nDocked=1\n");
+  TIDEDesktopService::BeginUpdate();
+  auto End = Finally([]() noexcept {
+    if (TIDEDesktopService::IsLocked()) RunIgnoringExceptions([] { TIDEDesktopService::EndUpdate(); });
+  });
+  LoadDesktopFormClasses(Desktop.Get());
+  auto* Host = dynamic_cast<TTabDockHostForm*>(Vars["DockSite0"]);
+  ASSERT_NE(Host, nullptr);
+  ASSERT_EQ(Host->DockInfoCount(), 2);
+  EXPECT_EQ(Host->DockTab()->TabIndex(), 0);
+  EXPECT_EQ(Host->ActivePage(), nullptr) << "a tab click waits while the host is in the batch";
+  TIDEDesktopService::EndUpdate();
+  TTabDockInfo* Alpha = Host->GetDockClientInfo(Vars["Alpha"]);
+  ASSERT_NE(Alpha, nullptr);
+  EXPECT_EQ(Host->ActivePage(), Alpha->TabSheet());
+  EXPECT_TRUE(Alpha->TabSheet()->Visible());
+  EXPECT_FALSE(Host->GetDockClientInfo(Vars["Beta"])->TabSheet()->Visible());
+  EXPECT_EQ(Host->Caption(), "Untitled Window") << "the caption of the tab in front";
+}
+
+TEST_F(DockHosts, ADesktopOfTabAndJoinHostsComesBackOnOtherMonitors) {
+  for (const char* S : {"Alpha", "Beta", "Gamma", "Delta"}) Register(TSectionTool::StaticClass(), S);
+  Register(TTabDockHostForm::StaticClass(), "DockSite0");
+  Register(TJoinDockForm::StaticClass(), "DockSite1");
+  auto Make = [&](const char* S) {
+    auto* W = MakeWindow<TSectionTool>(S);
+    W->SetBounds(0, 0, 200, 200);
+    W->Show();
+    return W;
+  };
+  auto* Tabs = MakeWindow<TTabDockHostForm>("DockSite0");
+  Tabs->SetBoundsRect(Rect(960, 104, 1440, 624));
+  Tabs->Show();
+  Tabs->ManualDockClient(Make("Alpha"), nullptr, alNone, false);
+  Tabs->ManualDockClient(Make("Beta"), nullptr, alNone, false);
+  Tabs->DockTab()->SetTabIndex(0);
+  auto* Join = MakeWindow<TJoinDockForm>("DockSite1");
+  Join->SetBoundsRect(Rect(192, 520, 1152, 1040));
+  Join->Show();
+  Join->ManualDockClient(Make("Gamma"), nullptr, alNone, false);
+  Join->ManualDockClient(Make("Delta"), Vars["Gamma"], alRight, false);
+  TObjectGuard<TMemIniFile> Desktop(new TMemIniFile(String()));
+  SaveDesktopFormClasses(Desktop.Get(), false);
+  EXPECT_EQ(Desktop->ReadString("DockSite0", "TabDockClients", "?"), "Alpha,Beta");
+  EXPECT_EQ(Desktop->ReadString("DockSite0", "ActiveTabID", "?"), "Alpha");
+  EXPECT_EQ(Desktop->ReadString("DockSite0", "Left", "?"), "5000");
+  EXPECT_EQ(Desktop->ReadString("DockSite0", "Width", "?"), "2500");
+  EXPECT_EQ(Desktop->ReadString("DockSite1", "DockClients", "?"), "Gamma,Delta");
+  EXPECT_EQ(Desktop->ReadString("DockSite1", "Top", "?"), "5000");
+  EXPECT_EQ(Desktop->ReadString("Alpha", "Docked", "?"), "1");
+
+  // Freed, and loaded in one batch on a larger primary with a second monitor to its left.
+  for (auto& Entry : Vars)
+    if (Entry.second && Exists(Entry.second)) Entry.second->Destroy();
+  for (auto& Entry : Vars) Entry.second = nullptr;
+  ProcessMessages();
+  ASSERT_TRUE(HostDockFormList().empty());
+  Screen()->SetMonitors({{Rect(-1280, 0, 0, 1024), Rect(-1280, 0, 0, 984), 96, false},
+                         {Rect(0, 0, 2560, 1440), Rect(0, 0, 2560, 1400), 96, true}});
+  TIDEDesktopService::BeginUpdate();
+  LoadDesktopFormClasses(Desktop.Get());
+  TIDEDesktopService::EndUpdate();
+  ProcessMessages();
+  auto* NewTabs = dynamic_cast<TTabDockHostForm*>(Vars["DockSite0"]);
+  auto* NewJoin = dynamic_cast<TJoinDockForm*>(Vars["DockSite1"]);
+  ASSERT_NE(NewTabs, nullptr);
+  ASSERT_NE(NewJoin, nullptr);
+  EXPECT_EQ(NewTabs->BoundsRect(), Rect(1280, 140, 1920, 840)) << "half across, a quarter wide, scaled";
+  EXPECT_EQ(NewJoin->BoundsRect(), Rect(256, 700, 1536, 1400));
+  EXPECT_EQ(TabTexts(NewTabs), (std::vector<String>{"Alpha", "Beta"}));
+  EXPECT_EQ(NewTabs->DockTab()->TabIndex(), 0);
+  EXPECT_EQ(NewTabs->ActivePage(), NewTabs->GetDockClientInfo(Vars["Alpha"])->TabSheet());
+  EXPECT_EQ(NewTabs->Caption(), "Alpha");
+  EXPECT_EQ(DockClients(NewJoin), (std::vector<TControl*>{Vars["Gamma"], Vars["Delta"]}));
+  EXPECT_LT(Vars["Gamma"]->Left(), Vars["Delta"]->Left()) << "side by side as they were";
+  EXPECT_EQ(Vars["Gamma"]->Top(), Vars["Delta"]->Top());
+  EXPECT_EQ(NewJoin->Caption(), "Gamma, Delta");
+  for (const char* S : {"DockSite0", "DockSite1"}) {
+    EXPECT_TRUE(Vars[S]->Visible()) << S;
+    ExpectOnAMonitor(Vars[S], S);
+  }
+}
+
+TEST_F(DockHosts, ADialogCharacterGoesToTheClientThatHasTheFocus) {
+  auto Box = [](TWinControl* Parent, const char* Caption) {
+    auto* B = CreateComponentOf<TAccelBox>(Parent);
+    B->SetParent(Parent);
+    B->SetCaption(Caption);
+    B->SetBounds(4, 4, 60, 20);
+    return B;
+  };
+  THostedTool* A = Tool("A", Rect(100, 100, 300, 300));
+  THostedTool* B = Tool("B", Rect(400, 100, 600, 300));
+  THostedTool* Outside = Tool("Outside", Rect(900, 600, 1100, 800));
+  TAccelBox* BoxA = Box(A, "&Run");
+  TAccelBox* BoxB = Box(B, "&Run");
+  auto* Join = CreateComponentOf<TJoinDockForm>(Application());
+  Join->SetBoundsRect(Rect(100, 400, 700, 800));
+  Join->Show();
+  Join->ManualDockClient(A, nullptr, alNone, false);
+  Join->ManualDockClient(B, A, alRight, false);
+  EXPECT_EQ(Join->GetDialogCharParentClass(), TDockableForm::StaticClass());
+  SetFocus(BoxB);
+  EXPECT_EQ(SendMessage(Join, CM_DIALOGCHAR, 'r', 0), 1);
+  EXPECT_EQ(BoxA->Taken, 0) << "only the client that has the focus is asked";
+  EXPECT_EQ(BoxB->Taken, 1);
+  EXPECT_EQ(SendMessage(Join, CM_DIALOGCHAR, 'x', 0), 0) << "nobody's accelerator";
+  SetFocus(Outside);
+  EXPECT_EQ(SendMessage(Join, CM_DIALOGCHAR, 'R', 0), 1);
+  EXPECT_EQ(BoxA->Taken, 1) << "with the focus elsewhere the clients are asked in order";
+  EXPECT_EQ(BoxB->Taken, 1) << "and the first that takes it ends the round";
+
+  // A tab host asks its page area: only the client in front can take it.
+  THostedTool* C = Tool("C", Rect(100, 100, 300, 300));
+  THostedTool* D = Tool("D", Rect(400, 100, 600, 300));
+  TAccelBox* BoxC = Box(C, "&Go");
+  TAccelBox* BoxD = Box(D, "&Go");
+  auto* Tabs = CreateComponentOf<TTabDockHostForm>(Application());
+  Tabs->SetBoundsRect(Rect(800, 100, 1200, 500));
+  Tabs->Show();
+  Tabs->ManualDockClient(C, nullptr, alNone, false);
+  Tabs->ManualDockClient(D, nullptr, alNone, false);
+  EXPECT_EQ(SendMessage(Tabs, CM_DIALOGCHAR, 'g', 0), 1);
+  EXPECT_EQ(BoxC->Taken, 0);
+  EXPECT_EQ(BoxD->Taken, 1);
+  Tabs->DockTab()->SetTabIndex(0);
+  EXPECT_EQ(SendMessage(Tabs, CM_DIALOGCHAR, 'g', 0), 1);
+  EXPECT_EQ(BoxC->Taken, 1);
+}
+
 TEST_F(DockHosts, JoinHostsKeepTheirClientsAndTheirTree) {
   THostedTool* Target = Tool("Target", Rect(100, 100, 451, 351));
   THostedTool* Dragged = Tool("Dragged", Rect(900, 500, 1100, 700));
@@ -399,6 +603,9 @@ TEST_F(DockHosts, TabHostsMergeAndHostsFollowTheirClients) {
   B->SetParent(First);
   SendMessage(First, UMNewClientFocused, 0, reinterpret_cast<std::intptr_t>(A));
   EXPECT_EQ(B->Deactivations, 1);
+  B->SetEnabled(false);
+  B->SetEnabled(true);
+  EXPECT_EQ(B->Deactivations, 1) << "a change of its enablement is no deactivation";
 
   // Who may come and go: no source editor in a tab; no drop on a plain window.
   auto* Editor = CreateComponentOf<TEditWindow>(Application());
