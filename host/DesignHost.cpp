@@ -185,6 +185,14 @@ TDesignSession::TDesignSession() {
   FEnvironment = New<THostEnvironment>(this);
   InitializeDesigners(InterfaceOf<IDesignEnvironment>(FEnvironment.Get()));
   FDesigner = Designers()->DesignerFromExtension(".kfm");
+  // No one is at the keyboard: every question while a module is read or saved is
+  // answered by cancelling, so a broken module is refused rather than changed.
+  TKilnRoot::ReadErrorAnswer = [](const String&) { return rerCancel; };
+  TKilnRoot::AncestorRecoveryAnswer = [](const String&, const String&, String&, const String&, bool) {
+    return rrCancel;
+  };
+  TKilnRoot::RedirectLinksAnswer = [](const String&, const String&) { return qrCancel; };
+  TKilnRoot::DeleteWarningAnswer = [](const String&) { return dwCancel; };
   // The devices a module's views are named after.
   TDeviceInfo::AddDevice("Phone", {{"Size", "360x640"}});
   TDeviceInfo::AddDevice("Tablet", {{"Size", "768x1024"}});
@@ -204,6 +212,10 @@ TDesignSession::~TDesignSession() {
   FinalizeKiln();
   FEnvironment = nullptr;
   TDeviceInfo::ClearDevices();
+  TKilnRoot::ReadErrorAnswer = nullptr;
+  TKilnRoot::AncestorRecoveryAnswer = nullptr;
+  TKilnRoot::RedirectLinksAnswer = nullptr;
+  TKilnRoot::DeleteWarningAnswer = nullptr;
   SessionRunning = false;
 }
 

@@ -205,8 +205,8 @@ private:
   void Revert(const String& Answer) {
     if (!Answer.empty() && !SameText(Answer, "yes") && !SameText(Answer, "no")) throw EHostError(sUnknownHow, Answer);
     TDeleteWarnResult Given = Answer.empty() ? dwCancel : SameText(Answer, "yes") ? dwYes : dwNo;
-    TKilnRoot::DeleteWarningAnswer = [Given](const String&) { return Given; };
-    auto Forget = Finally([]() noexcept { TKilnRoot::DeleteWarningAnswer = nullptr; });
+    auto Before = std::exchange(TKilnRoot::DeleteWarningAnswer, [Given](const String&) { return Given; });
+    auto Restore = Finally([&Before]() noexcept { TKilnRoot::DeleteWarningAnswer = std::move(Before); });
     Root()->Command(dmRevert);
   }
   /// The master of the current module: the module itself unless it is a view.

@@ -47,6 +47,8 @@ FK_RESOURCESTRING(sCannotInherit,
 FK_RESOURCESTRING(sCannotCreateComponentOnView, "This component can only be created on the Master View");
 FK_RESOURCESTRING(sDuplicateViewName, "View \"%s\" already exists in module");
 FK_RESOURCESTRING(sViewDoesntExist, "View \"%s\" does not exist in module");
+FK_RESOURCESTRING(sRedirectLinks, "Module '%s' links to module '%s' which cannot be found in the current project.  "
+                                  "Do you wish to remove/redirect the links to another module?");
 FK_RESOURCESTRING(sAncestorDeleteWarning, "Reverting '%s' deletes all contained components not found in the ancestor "
                                           "and will delete the following: %s.  Continue?");
 FK_RESOURCESTRING(sRenamingAncestor, "Cannot rename component %s, component was introduced in an ancestor form");

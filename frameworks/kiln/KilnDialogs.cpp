@@ -8,6 +8,7 @@
 
 namespace formkit {
 
+FK_RESOURCESTRING(SNoSuchButton, "Form %s has no button %s");
 FK_RESOURCESTRING(SNoScriptedAnswer, "No answer is scripted for the dialog \"%s\"");
 FK_RESOURCESTRING(SMsgDlgWarning, "Warning");
 FK_RESOURCESTRING(SMsgDlgError, "Error");
@@ -76,7 +77,11 @@ String MessageDialogCaption(TMsgDlgType Type) {
 //===----------------------------------------------------------------------===//
 
 void TDialogScript::Answer(TModalResult Result, std::vector<String> Values) {
-  FAnswers.emplace_back(Result, std::move(Values));
+  FAnswers.push_back({Result, std::move(Values), nullptr});
+}
+
+void TDialogScript::AnswerBy(std::function<TModalResult(TCustomForm& Form)> User) {
+  FAnswers.push_back({mrNone, {}, std::move(User)});
 }
 
 void TDialogScript::Clear() noexcept {
@@ -84,12 +89,22 @@ void TDialogScript::Clear() noexcept {
   FShown.clear();
 }
 
-std::pair<TModalResult, std::vector<String>> TDialogScript::Take(TShownDialog Dialog) {
+TDialogScript::TAnswer TDialogScript::Next(TShownDialog Dialog) {
   if (FAnswers.empty()) throw EInvalidOperation(SNoScriptedAnswer, Dialog.Caption);
   FShown.push_back(std::move(Dialog));
-  auto A = std::move(FAnswers.front());
+  TAnswer A = std::move(FAnswers.front());
   FAnswers.pop_front();
   return A;
+}
+
+std::pair<TModalResult, std::vector<String>> TDialogScript::Take(TShownDialog Dialog) {
+  TAnswer A = Next(std::move(Dialog));
+  return {A.Result, std::move(A.Values)};
+}
+
+TModalResult TDialogScript::TakeFor(TShownDialog Dialog, TCustomForm& Form) {
+  TAnswer A = Next(std::move(Dialog));
+  return A.User ? A.User(Form) : A.Result;
 }
 
 TDialogScript& DialogScript() {
@@ -123,9 +138,17 @@ TModalResult ShowRecorded(TCustomForm* Form, const char* Kind, TMsgDlgType DlgTy
   if (auto* Msg = dynamic_cast<TControl*>(Form->FindComponent("Message"))) D.Message = Msg->Caption();
   Form->Show();
   auto HideAgain = Finally([Form]() noexcept { RunIgnoringExceptions([Form] { Form->Hide(); }); });
-  return DialogScript().Take(std::move(D)).first;
+  return DialogScript().TakeFor(std::move(D), *Form);
 }
 } // namespace
+
+TModalResult ClickButton(TCustomForm& Form, const String& Name) {
+  auto* Button = dynamic_cast<TButton*>(Form.FindComponent(Name));
+  if (!Button || !Button->Enabled()) throw EInvalidOperation(SNoSuchButton, Form.Name(), Name);
+  Form.SetModalResult(mrNone);
+  Button->Click();
+  return Form.ModalResult() != mrNone ? Form.ModalResult() : Button->ModalResult();
+}
 
 TModalResult ShowModal(TCustomForm* Form) { return ShowRecorded(Form, "ShowModal", mtCustom); }
 

@@ -70,6 +70,10 @@ class FK_API TDialogScript {
 public:
   /// The next dialog answers `Result`; an input query also takes `Values` as typed.
   void Answer(TModalResult Result, std::vector<String> Values = {});
+  /// The next dialog, a form shown modally, is answered by `User`: what a person does
+  /// on the open form (checks a radio button, chooses an item, clicks a button) and the
+  /// modal result that closes it.
+  void AnswerBy(std::function<TModalResult(TCustomForm& Form)> User);
   int PendingAnswers() const noexcept { return static_cast<int>(FAnswers.size()); }
   const std::vector<TShownDialog>& Shown() const noexcept { return FShown; }
   /// Drops the answers not taken and the record.
@@ -79,9 +83,17 @@ public:
   /// `EInvalidOperation` "No answer is scripted for the dialog \"%s\"" when there is
   /// none, and then nothing is recorded.
   [[nodiscard]] std::pair<TModalResult, std::vector<String>> Take(TShownDialog Dialog);
+  /// `Take` for a form shown modally: an answer given by `AnswerBy` acts on `Form`.
+  [[nodiscard]] TModalResult TakeFor(TShownDialog Dialog, TCustomForm& Form);
 
 private:
-  std::deque<std::pair<TModalResult, std::vector<String>>> FAnswers;
+  struct TAnswer {
+    TModalResult Result = mrNone;
+    std::vector<String> Values;
+    std::function<TModalResult(TCustomForm&)> User;
+  };
+  [[nodiscard]] TAnswer Next(TShownDialog Dialog);
+  std::deque<TAnswer> FAnswers;
   std::vector<TShownDialog> FShown;
 };
 
@@ -95,6 +107,12 @@ FK_API TDialogScript& DialogScript();
 /// Shows `Form` modally and answers the scripted result; the form is hidden afterwards.
 /// The record lists the form's buttons (at any depth) in the order of their left edges.
 FK_API TModalResult ShowModal(TCustomForm* Form);
+
+/// What a person's click on button `Name` of a modal form answers: the button's
+/// `OnClick` runs, and the result is the form's modal result when the click set one, else
+/// the button's. Raises `EInvalidOperation` "Form %s has no button %s" for a name that is
+/// no enabled button of the form.
+FK_API TModalResult ClickButton(TCustomForm& Form, const String& Name);
 
 /// Shows a message dialog modally, recorded as "MessageDlg" of `DlgType`.
 FK_API TModalResult ShowMessageDialog(TCustomForm* Form, TMsgDlgType DlgType);

@@ -77,6 +77,18 @@ void TCustomForm::BeforeDestruction() {
   inherited::BeforeDestruction();
 }
 
+void TCustomForm::SetActiveControl(TWinControl* Value) {
+  if (Value == FActiveControl) return;
+  if (FActiveControl) RemoveFreeNotification(FActiveControl);
+  FActiveControl = Value;
+  if (Value) FreeNotification(Value);
+}
+
+void TCustomForm::Notification(TComponent* AComponent, TOperation Operation) {
+  inherited::Notification(AComponent, Operation);
+  if (Operation == opRemove && AComponent == FActiveControl) FActiveControl = nullptr;
+}
+
 int TCustomForm::ClientWidth() const {
   TPoint Off = ClientOffset();
   return std::max(Width() - 2 * Off.X, 0);

@@ -123,16 +123,28 @@ class FK_API TCustomForm : public TDesignableRoot<TWinControl> {
   TNotifyEvent OnShow;
   TNotifyEvent OnHide;
 
+  /// What the form answers when it closes from modal showing; 0 while it has not.
+  int ModalResult() const noexcept { return FModalResult; }
+  void SetModalResult(int Value) noexcept { FModalResult = Value; }
+
+  /// The control that has the focus within the form, or null. Not owned: it clears
+  /// itself when that control goes.
+  TWinControl* ActiveControl() const noexcept { return FActiveControl; }
+  void SetActiveControl(TWinControl* Value);
+
   void GetChildren(const TGetChildProc& Proc, TComponent* Root) override;
   void SetChildOrder(TComponent* Child, int Order) override;
   void Loaded() override;
 
 protected:
+  void Notification(TComponent* AComponent, TOperation Operation) override;
   void WndProc(TMessage& Message) override;
   void ChangeScale(int M, int D, int NewPPI) override;
 
 private:
   TFormBorderStyle FBorderStyle = bsSizeable;
+  TWinControl* FActiveControl = nullptr;
+  int FModalResult = 0;
   bool FScaled = true;
   TWindowState FWindowState = wsNormal;
   TPosition FPosition = poDesigned;

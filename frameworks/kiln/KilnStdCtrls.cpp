@@ -41,6 +41,7 @@ FK_IMPLEMENT(TLabel, "KilnStdCtrls") {
   detail::PublishEnabled(B);
   detail::PublishFont(B);
   B.Property("Transparent", &TLabel::Transparent, &TLabel::SetTransparent).Default(false);
+  B.Property("WordWrap", &TLabel::WordWrap, &TLabel::SetWordWrap).Default(false);
   B.Property("FocusControl", &TLabel::FocusControl, &TLabel::SetFocusControl);
   detail::PublishVisible(B);
   detail::PublishOnClick(B);

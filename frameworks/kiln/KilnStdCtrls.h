@@ -47,6 +47,9 @@ class FK_API TLabel : public TGraphicControl {
   /// Whether the background shows through.
   bool Transparent() const noexcept { return FTransparent; }
   void SetTransparent(bool Value) noexcept { FTransparent = Value; }
+  /// Whether the caption breaks into lines at the label's width.
+  bool WordWrap() const noexcept { return FWordWrap; }
+  void SetWordWrap(bool Value) noexcept { FWordWrap = Value; }
   /// Fills the background unless transparent, then writes the caption at (0, 0).
   void Paint(TCanvas* Canvas) override;
   /// The windowed control that takes the focus for this label's accelerator; null when
@@ -59,6 +62,7 @@ protected:
 
 private:
   bool FTransparent = false;
+  bool FWordWrap = false;
   TWinControl* FFocusControl = nullptr;
 };
 

@@ -209,9 +209,9 @@ class FK_API TKilnRoot : public TComponentRoot {
   TKilnSurface* KilnSurface() const noexcept { return FKilnSurface; }
 
   // The user's answers while modules are read and saved ---------------------------------
-  // A host sets them: an interactive one from its dialogs, a command-line one from its
-  // options, a test from its script. Unset, every question is answered by cancelling,
-  // so nothing a user designed changes without a decision.
+  // Unset, each question goes to the user: the recovery dialogs (RecoveryDialogs.h) and
+  // message dialogs on Kiln forms. A host without a person at the keyboard (a command
+  // line) sets them to answer from its options instead.
   /// Answers a read error with its message.
   static inline std::function<TRootReadErrorResult(const String& Message)> ReadErrorAnswer;
   /// Answers for an inherited component the ancestor lacks; may change `NewName`.

@@ -2,6 +2,7 @@
 #include "frameworks/kiln/design/KilnDesign.h"
 
 #include "frameworks/kiln/KilnClipbrd.h"
+#include "frameworks/kiln/design/RecoveryDialogs.h"
 #include "platform/Filer.h"
 
 namespace formkit {
@@ -128,21 +129,33 @@ void TKilnRoot::FrameComponentAdded(TComponent* Component) {
 //===----------------------------------------------------------------------===//
 
 TRootReadErrorResult TKilnRoot::AskReadError(const String& Message) {
-  return ReadErrorAnswer ? ReadErrorAnswer(Message) : rerCancel;
+  if (ReadErrorAnswer) return ReadErrorAnswer(Message);
+  switch (FormReadError(Message, ChangeFileExt(ExtractFileName(FFileName), ""))) {
+  case mrOk: return rerOK;
+  case mrIgnoreAll: return rerIgnoreAll;
+  default: return rerCancel;
+  }
 }
 
 TRecoveryResult TKilnRoot::AskAncestorRecovery(const String& RootName, const String& AncestorName, String& NewName,
                                                const String& Candidates, bool Nested) {
-  return AncestorRecoveryAnswer ? AncestorRecoveryAnswer(RootName, AncestorName, NewName, Candidates, Nested)
-                                : rrCancel;
+  if (AncestorRecoveryAnswer) return AncestorRecoveryAnswer(RootName, AncestorName, NewName, Candidates, Nested);
+  return FormInheritenceRecovery(RootName, AncestorName, NewName, Candidates, Nested);
 }
 
 TQueryRedirectLinksResult TKilnRoot::AskRedirectLinks(const String& RootName, const String& LinkedName) {
-  return RedirectLinksAnswer ? RedirectLinksAnswer(RootName, LinkedName) : qrCancel;
+  if (RedirectLinksAnswer) return RedirectLinksAnswer(RootName, LinkedName);
+  switch (MessageDlgPos(Format(LoadResString(sRedirectLinks), RootName, LinkedName), mtConfirmation,
+                        {mbYes, mbNo, mbCancel}, 0, -1, -1)) {
+  case mrYes: return qrYes;
+  case mrNo: return qrNo;
+  default: return qrCancel;
+  }
 }
 
 void TKilnRoot::RedirectLinks(TComponent* Root, const String& LinkedName) {
-  String Target = RedirectTarget ? RedirectTarget(Root, LinkedName) : String();
+  if (!RedirectTarget) return formkit::RedirectLinks(Root, LinkedName);
+  String Target = RedirectTarget(Root, LinkedName);
   if (Target.empty()) RemoveFixupReferences(Root, LinkedName);
   else RedirectFixupReferences(Root, LinkedName, Target);
 }
@@ -190,8 +203,13 @@ void TKilnRoot::AdjustReadComponent(TComponent* Component, const TRect& Rect, co
 }
 
 TDeleteWarnResult TKilnRoot::AskDeleteWarning(const String& ComponentName, const String& Names) {
-  return DeleteWarningAnswer ? DeleteWarningAnswer(Format(LoadResString(sAncestorDeleteWarning), ComponentName, Names))
-                             : dwCancel;
+  String Question = Format(LoadResString(sAncestorDeleteWarning), ComponentName, Names);
+  if (DeleteWarningAnswer) return DeleteWarningAnswer(Question);
+  switch (MessageDlgPos(Question, mtConfirmation, {mbYes, mbNo, mbCancel}, 0, -1, -1)) {
+  case mrYes: return dwYes;
+  case mrNo: return dwNo;
+  default: return dwCancel;
+  }
 }
 
 namespace {

@@ -10,6 +10,7 @@
 
 #include "tests/frameworks/kiln/design/KilnDesignFixture.h"
 
+#include "frameworks/kiln/KilnDialogs.h"
 #include "platform/Filer.h"
 
 #include <filesystem>
@@ -31,6 +32,8 @@ struct ModuleFilesTest : KilnDesignFixture {
     TKilnRoot::AncestorRecoveryAnswer = nullptr;
     TKilnRoot::RedirectLinksAnswer = nullptr;
     TKilnRoot::RedirectTarget = nullptr;
+    EXPECT_EQ(DialogScript().PendingAnswers(), 0) << "a question the test expected was not asked";
+    DialogScript().Clear();
     Env->OnOpenModuleByName = nullptr;
     KilnDesignFixture::TearDown();
     std::error_code Ignored;

@@ -8,6 +8,7 @@
 // read-only files; reading asks the user about errors and missing ancestors.
 //
 //===----------------------------------------------------------------------===//
+#include "frameworks/kiln/design/RecoveryDialogs.h"
 #include "tests/frameworks/kiln/design/ModuleFilesFixture.h"
 
 using namespace formkit;
@@ -208,9 +209,12 @@ TEST_F(ModuleFilesTest, ReadErrorsAskTheUserWhoMayIgnoreOnceIgnoreAllOrCancel) {
   EXPECT_EQ(Asked.size(), 1u) << "no further question in this read";
   All->Close();
 
+  // Without the host's answer the user is asked, through the read error dialog.
   int Roots = Designer->GetRootsCount();
-  TKilnRoot::ReadErrorAnswer = nullptr; // unanswered: cancelled
+  TKilnRoot::ReadErrorAnswer = nullptr;
+  DialogScript().Answer(mrCancel);
   EXPECT_THROW(OpenAt("Broken.kfm"), EReadError);
+  EXPECT_EQ(DialogScript().Shown().back().Caption, "Error Reading Form: 'Broken'");
   EXPECT_EQ(Designer->GetRootsCount(), Roots);
 }
 
@@ -441,8 +445,24 @@ TEST_F(ModuleFilesTest, LinksToModulesThatAreNotOpenStopASaveUntilTheUserRedirec
       return E.Message();
     }
   };
+  // The user is asked, and cancels.
+  DialogScript().Answer(mrCancel);
   EXPECT_EQ(Refusal(), "Module \"Form1\" references other modules and cannot be saved until the following modules are "
                        "loaded: Form2,Form3");
+  ASSERT_EQ(DialogScript().Shown().size(), 1u);
+  EXPECT_EQ(DialogScript().Shown()[0].Caption, "Confirmation");
+  EXPECT_EQ(DialogScript().Shown()[0].Message,
+            "Module 'Form1' links to module 'Form2' which cannot be found in the current project.  Do you wish to "
+            "remove/redirect the links to another module?");
+  EXPECT_EQ(DialogScript().Shown()[0].Buttons, (std::vector<String>{"Yes", "No", "Cancel"}));
+  // The links to Form2 are redirected: no other module is open, so the user can only
+  // remove them, by OK with nothing chosen.
+  std::vector<String> Offered;
+  DialogScript().AnswerBy([&](TCustomForm& Dialog) {
+    TStrings* Items = static_cast<TLinkRedirect&>(Dialog).LinkNames->Items();
+    for (int I = 0; I < Items->Count(); ++I) Offered.push_back(Items->Get(I));
+    return ClickButton(Dialog, "OKBtn");
+  });
   std::vector<String> Asked;
   TKilnRoot::RedirectLinksAnswer = [&](const String& Root, const String& Linked) {
     Asked.push_back(Root + "->" + Linked);
@@ -450,8 +470,11 @@ TEST_F(ModuleFilesTest, LinksToModulesThatAreNotOpenStopASaveUntilTheUserRedirec
   };
   EXPECT_EQ(Refusal(), "Module \"Form1\" references another module and cannot be saved until Form3 is loaded");
   EXPECT_EQ(Asked, (std::vector<String>{"Form1->Form2", "Form1->Form3"}));
+  EXPECT_EQ(Offered, std::vector<String>{"<Remove links>"}) << "the module does not offer itself";
+  EXPECT_EQ(DialogScript().Shown().back().Caption, "Link Redirection");
   EXPECT_TRUE(KilnRoot(Alone)->HadReadError()) << "a redirect changes what was read";
   TKilnRoot::RedirectLinksAnswer = [](const String&, const String&) { return qrYes; };
+  DialogScript().Answer(mrOk);
   EXPECT_EQ(Refusal(), "saved");
 }
 
