@@ -16,6 +16,7 @@
 
 #include "editors/ComponentEditors.h"
 #include "editors/ComponentGuidelines.h"
+#include "editors/CustomModule.h"
 #include "editors/EditorRegistry.h"
 #include "editors/PropertyEditor.h"
 #include "editors/ReferenceEditors.h"

@@ -84,6 +84,21 @@ TClass GetClass(std::string_view ClassName) {
   return nullptr;
 }
 
+FK_IMPLEMENT(TClassFinder, "Classes") {}
+
+TClass TClassFinder::GetClass(std::string_view ClassName) const {
+  Registry& R = TheRegistry();
+  String Key = UpperCase(ClassName);
+  std::vector<size_t> Groups{FClass ? GroupIndexOf(R, Compiled(FClass)) : size_t(0)};
+  if (FIncludeActiveGroups) Groups.push_back(R.Active);
+  Groups.push_back(0);
+  for (size_t G : Groups) {
+    auto It = R.Groups[G].Classes.find(Key);
+    if (It != R.Groups[G].Classes.end()) return It->second;
+  }
+  return nullptr;
+}
+
 TClass FindClass(std::string_view ClassName) {
   TClass C = GetClass(ClassName);
   if (!C) throw EClassNotFound(SClassNotFound, String(ClassName));

@@ -478,6 +478,23 @@ FK_API TClass ActivateClassGroup(TClass Class);
 /// The class that represents the current class group.
 FK_API TClass CurrentClassGroup();
 
+/// Finds registered classes by name in the class group of one class and in the base
+/// group, whatever group is current; with `IncludeActiveGroups`, in the current group too.
+class FK_API TClassFinder : public TObject {
+  FK_CLASS(TClassFinder, TObject)
+  TClassFinder() = default;
+  explicit TClassFinder(TClass AClass, bool IncludeActiveGroups = false)
+      : FClass(AClass), FIncludeActiveGroups(IncludeActiveGroups) {}
+  /// The class the finder was made for.
+  TClass ForClass() const noexcept { return FClass; }
+  /// The registered class named `ClassName` (any case), or null.
+  [[nodiscard]] TClass GetClass(std::string_view ClassName) const;
+
+private:
+  TClass FClass = nullptr;
+  bool FIncludeActiveGroups = false;
+};
+
 /// The group of the design package being loaded: registrations record it so that the
 /// package's registrations can be dropped when it unloads. -1 outside any package.
 FK_API extern int CurrentGroup;
