@@ -102,7 +102,7 @@ const std::map<String, std::vector<String>> ExpectedTexts = {
       "FocusControl=", "Font=(TFont)", "Font.Color=-16777208", "Font.Name=Sans Serif",
       "Font.Size=9", "Font.Style=[]", "Height=17", "Hint=", "Left=0", "Name=Label1",
       "OnClick=", "ParentFont=True", "Tag=0", "Top=0", "Transparent=False", "Visible=True",
-      "Width=65"}},
+      "Width=65", "WordWrap=False"}},
     {"TEdit",
      {"Align=alNone", "Color=-16777211", "Cursor=0", "Enabled=True", "Font=(TFont)",
       "Font.Color=-16777208", "Font.Name=Sans Serif", "Font.Size=9", "Font.Style=[]", "Height=23",
