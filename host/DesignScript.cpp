@@ -36,7 +36,12 @@ FK_RESOURCESTRING(sUnknownHow, "unknown way '%s'");
 //===----------------------------------------------------------------------===//
 
 TComponent* ComponentNamed(const IPtr<IRoot>& Root, const String& Name) {
-  TComponent* C = SameText(Name, Root->GetRootName()) ? Root->GetRoot() : Root->GetRoot()->FindComponent(Name);
+  TComponent* C = Root->GetRoot();
+  if (!SameText(Name, Root->GetRootName())) {
+    // "Frame11.Button3": a component of a nested frame, through the frame.
+    std::istringstream Path(Name);
+    for (String Part; C && std::getline(Path, Part, '.');) C = C->FindComponent(Part);
+  }
   if (!C) throw EHostError(sNoSuchComponent, Root->GetRootName(), Name);
   return C;
 }

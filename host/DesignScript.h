@@ -61,7 +61,8 @@ namespace formkit {
   "  close                     closes the current module\n"                                         \
   "  expect NAME.PROP VALUE    stops the script unless the property shows VALUE\n"
 
-/// The component named `Name` of the open module `Root` (its own name gives its root).
+/// The component named `Name` of the open module `Root` (its own name gives its root;
+/// "Frame11.Button3" a component of its nested frame Frame11).
 /// Raises `EHostError` "Module %s has no component named '%s'".
 [[nodiscard]] FK_API TComponent* ComponentNamed(const IPtr<IRoot>& Root, const String& Name);
 /// The properties the inspector lists for `Component` of `Root`, in its order.

@@ -6,6 +6,7 @@
 #include "host/DesignScript.h"
 #include "host/DesktopRender.h"
 #include "host/FormRender.h"
+#include "host/StructurePrint.h"
 #include "platform/TypInfo.h"
 
 #include <filesystem>
@@ -70,19 +71,11 @@ String AttributeText(TPropertyAttributes Attributes) {
   return Text;
 }
 
-void PrintTree(TComponent* Component, TComponent* Root, int Depth, std::ostream& Out) {
-  Out << String(static_cast<std::size_t>(Depth) * 2, ' ') << Component->Name() << ": " << Component->ClassName() << "\n";
-  // A nested frame's insides are the frame's own components.
-  TComponent* Lookup = Component->ComponentState().Contains(csInline) ? Component : Root;
-  std::vector<TComponent*> Children;
-  Component->GetChildren([&](TComponent* Child) { Children.push_back(Child); }, Lookup);
-  for (TComponent* Child : Children) PrintTree(Child, Lookup, Depth + 1, Out);
-}
-
 void Tree(const std::vector<String>& Args, std::ostream& Out) {
+  InitializeStructureTree(); // joins the core before the session starts it
   TDesignSession Session;
-  IPtr<IRoot> Root = Session.Open(Args[0]);
-  PrintTree(Root->GetRoot(), Root->GetRoot(), 0, Out);
+  InitDesignNotification();
+  PrintStructure(Session.Open(Args[0]), Out, true);
 }
 
 void Props(const std::vector<String>& Args, std::ostream& Out) {
@@ -242,7 +235,12 @@ const std::map<String, TSubcommand>& Subcommands() {
         "device size (a view named after the device Phone, Tablet or Desktop takes its size)\n"
         "and file, tab-separated.\n",
         1, Views}},
-      {"tree", {"FILE", "Prints the module's components, one a line, each under the one it stands in.\n", 1, Tree}},
+      {"tree",
+       {"FILE",
+        "Prints the module's structure tree, one node a line, each under the one it stands in:\n"
+        "components with their class names, collections by property name and their items by\n"
+        "index, the components of a nested frame under the frame.\n",
+        1, Tree}},
       {"props",
        {"FILE NAME",
         "Prints what the inspector lists for component NAME (or the module's own name): one\n"

@@ -9,6 +9,7 @@
 
 #include "platform/TypInfo.h"
 
+#include <unordered_map>
 #include <unordered_set>
 
 namespace formkit {
@@ -42,10 +43,29 @@ bool MayHoldCollection(PPropInfo Prop) {
 }
 } // namespace
 
+namespace {
+/// The properties of each class that may hold a collection, found at the class's first
+/// sprig; exists while the tree runs.
+std::unique_ptr<std::unordered_map<TClass, std::vector<PPropInfo>>> GCollectionProperties;
+
+/// The published properties of `Class` that may hold a collection, in sorted order.
+/// Generated classes share their compiled class's properties, so that is the key.
+const std::vector<PPropInfo>& CollectionPropertiesOf(TClass Class) {
+  if (!GCollectionProperties) GCollectionProperties = std::make_unique<std::unordered_map<TClass, std::vector<PPropInfo>>>();
+  auto [It, Added] = GCollectionProperties->try_emplace(Class);
+  if (Added)
+    for (PPropInfo Prop : Class->SortedProperties())
+      if (Prop->Kind() == tkClass && MayHoldCollection(Prop)) It->second.push_back(Prop);
+  return It->second;
+}
+} // namespace
+
+namespace detail {
+void FreeCollectionProperties() noexcept { GCollectionProperties.reset(); }
+} // namespace detail
+
 void TSprig::FigureCollections() {
-  // The class's own sorted list: no list is built for each sprig.
-  for (PPropInfo Prop : FItem->ClassType()->SortedProperties()) {
-    if (Prop->Kind() != tkClass || !MayHoldCollection(Prop)) continue;
+  for (PPropInfo Prop : CollectionPropertiesOf(FItem->CompiledClass())) {
     auto* Collection = dynamic_cast<TCollection*>(GetObjectProp(FItem, Prop));
     if (!Collection || !UltimateOwnerOf(Collection) || Find(Collection, false)) continue;
     TSprigClass SprigClass = FindBestSprigClass(Collection->ClassType(), TCollectionSprig::StaticClass());
@@ -81,10 +101,8 @@ void TCollectionSprig::DropGoneItems() {
   for (int I = 0; Collection && I < Collection->Count(); ++I) Present.insert(Collection->Items(I));
   for (int I = Count() - 1; I >= 0; --I) {
     TSprig* Child = Items(I);
-    if (dynamic_cast<TCollectionItemSprig*>(Child) && !Child->Invalid() && !Present.contains(Child->Item())) {
-      Child->Invalidate();
-      if (Root()) Root()->ItemInserted(); // the next refresh frees it
-    }
+    if (dynamic_cast<TCollectionItemSprig*>(Child) && !Child->Invalid() && !Present.contains(Child->Item()))
+      Child->Invalidate(); // the next repopulation frees it
   }
 }
 

@@ -22,28 +22,35 @@ FK_IMPLEMENT(TRootSprig, "TreeIntf") {}
 // TSprigIndex
 //===----------------------------------------------------------------------===//
 
-std::size_t TSprigIndex::BucketOf(const TPersistent* AItem) noexcept {
-  return (reinterpret_cast<std::uintptr_t>(AItem) >> 8) & 0xFF;
-}
-
 void TSprigIndex::Add(TSprig* ASprig) {
-  std::unique_ptr<TBucket>& Bucket = FList[BucketOf(ASprig->Item())];
-  if (!Bucket) Bucket = std::make_unique<TBucket>();
-  Bucket->emplace_back(ASprig->Item(), ASprig);
+  TEntry& Entry = FList[ASprig->Item()];
+  if (!Entry.First) {
+    Entry.First = ASprig;
+    return;
+  }
+  if (!Entry.More) Entry.More = std::make_unique<std::vector<TSprig*>>();
+  Entry.More->push_back(ASprig);
 }
 
 void TSprigIndex::Remove(TSprig* ASprig) {
-  std::unique_ptr<TBucket>& Bucket = FList[BucketOf(ASprig->Item())];
-  if (!Bucket) return;
-  std::erase_if(*Bucket, [&](const auto& Entry) { return Entry.second == ASprig; });
-  if (Bucket->empty()) Bucket.reset();
+  auto It = FList.find(ASprig->Item());
+  if (It == FList.end()) return;
+  TEntry& Entry = It->second;
+  if (Entry.First != ASprig) {
+    if (Entry.More) std::erase(*Entry.More, ASprig);
+    return;
+  }
+  if (!Entry.More || Entry.More->empty()) {
+    FList.erase(It);
+    return;
+  }
+  Entry.First = Entry.More->front();
+  Entry.More->erase(Entry.More->begin());
 }
 
 TSprig* TSprigIndex::Find(const TPersistent* AItem) const {
-  const std::unique_ptr<TBucket>& Bucket = FList[BucketOf(AItem)];
-  if (!Bucket) return nullptr;
-  auto It = std::find_if(Bucket->begin(), Bucket->end(), [&](const auto& Entry) { return Entry.first == AItem; });
-  return It == Bucket->end() ? nullptr : It->second;
+  auto It = FList.find(AItem);
+  return It == FList.end() ? nullptr : It->second.First;
 }
 
 //===----------------------------------------------------------------------===//
@@ -119,11 +126,26 @@ TSprig* TRootSprig::FindItemByPath(const String& APath, bool ARecurse) {
 }
 
 void TRootSprig::AddItem(TSprig* ASprig) {
-  if (ASprig->Item()) FIndex->Add(ASprig);
+  ++FAttached;
+  ++FPassAttached;
+  TPersistent* Item = ASprig->Item();
+  if (!Item) return;
+  FIndex->Add(ASprig);
+  if (ASprig->SortByIndex()) FSortedSprigs.insert(ASprig);
+  // Sprigs that were left elsewhere for want of this one move under it at the next read.
+  if (FWaiting.empty()) return;
+  auto It = FWaiting.find(Item);
+  if (It == FWaiting.end()) return;
+  std::vector<const TPersistent*> Waiting = std::move(It->second);
+  FWaiting.erase(It);
+  for (const TPersistent* Child : Waiting)
+    if (TSprig* Sprig = FIndex->Find(Child)) FigureAgain(Sprig);
 }
 
 void TRootSprig::RemoveItem(TSprig* ASprig) {
+  if (ASprig != this && FAttached > 0) --FAttached;
   if (ASprig->Item() && FIndex) FIndex->Remove(ASprig);
+  FSortedSprigs.erase(ASprig);
   std::erase(FNamedItems, ASprig);
   std::erase(FPathedItems, ASprig);
 }
@@ -132,25 +154,26 @@ void TRootSprig::RemoveItem(TSprig* ASprig) {
 // Repopulation
 //===----------------------------------------------------------------------===//
 
-void TRootSprig::SweepTree(TSprig* ASprig, std::unordered_set<TPersistent*>& Shown) {
-  if (!ASprig->Invalid() && ASprig->Item()) Shown.insert(ASprig->Item());
+void TRootSprig::SweepTree(TSprig* ASprig) {
   for (int I = ASprig->Count() - 1; I >= 0; --I)
-    if (I < ASprig->Count()) SweepTree(ASprig->Items(I), Shown);
+    if (I < ASprig->Count()) SweepTree(ASprig->Items(I));
   if (ASprig->Invalid() && ASprig != this) ASprig->Destroy();
 }
 
 namespace {
+/// Whether a component of the module has a place in its tree.
+bool ShowsInTree(const TComponent* C) {
+  return !C->ComponentStyle().Contains(csTransient) && C->ComponentState().Contains(csDesigning) &&
+         !C->ComponentState().Contains(csDestroying);
+}
+
 /// The root's own components that may have sprigs, in order.
 std::vector<TComponent*> DesignedComponentsOf(TComponent* Root) {
   std::vector<TComponent*> Work;
   if (!Root) return Work;
   Work.reserve(static_cast<std::size_t>(Root->ComponentCount()));
-  for (int I = 0; I < Root->ComponentCount(); ++I) {
-    TComponent* C = Root->Components(I);
-    if (C->ComponentStyle().Contains(csTransient)) continue;
-    if (!C->ComponentState().Contains(csDesigning) || C->ComponentState().Contains(csDestroying)) continue;
-    Work.push_back(C);
-  }
+  for (int I = 0; I < Root->ComponentCount(); ++I)
+    if (TComponent* C = Root->Components(I); ShowsInTree(C)) Work.push_back(C);
   return Work;
 }
 } // namespace
@@ -159,30 +182,14 @@ bool TRootSprig::Repopulate() {
   if (!FRepopulateNeeded) return false;
   BeginUpdate();
   FRepopulating = true;
-  // A failure leaves the bracket without announcing anything to the view.
+  // A failure leaves the bracket without announcing anything to the view, and the next
+  // read goes over the whole module.
   auto Undo = OnFailure([this]() noexcept {
     FRepopulating = false;
+    FRepopulateAll = true;
     --FUpdateLocks;
   });
-  std::vector<TComponent*> Work = DesignedComponentsOf(dynamic_cast<TComponent*>(Item()));
-  std::unordered_set<TPersistent*> Shown;
-  SweepTree(this, Shown);
-  bool Result = false;
-  for (TComponent* C : Work) {
-    if (Shown.contains(C)) continue;
-    TSprigClass SprigClass = FindBestSprigClass(C->ClassType(), TComponentSprig::StaticClass());
-    if (!SprigClass) continue;
-    TObjectGuard<TSprig> Sprig = NewSprig(SprigClass, C);
-    static_cast<TComponentSprig*>(Sprig.Get())->SetOwner(this);
-    Add(Sprig.Release());
-    Result = true;
-  }
-  const TSprigAction Validate = [this](TSprig* S) { ValidateParent(S); };
-  do {
-    FParentChanges = false;
-    ForEach(Validate, nullptr);
-  } while (FParentChanges);
-  ClearUnneededSprigs();
+  const bool Result = FRepopulateAll ? RepopulateAll() : RepopulateNoted();
   FExpanded = true;
   FRepopulateNeeded = false;
   FRepopulating = false;
@@ -191,17 +198,137 @@ bool TRootSprig::Repopulate() {
   return Result;
 }
 
+TSprig* TRootSprig::NewComponentSprig(TComponent* AComponent, TClassMemo& Memo) {
+  // Components come in runs of a few classes: the registry is asked once per class.
+  TClass Class = AComponent->ClassType();
+  auto Known = std::find_if(Memo.begin(), Memo.end(), [&](const auto& Entry) { return Entry.first == Class; });
+  TSprigClass SprigClass = Known != Memo.end() ? Known->second : nullptr;
+  if (Known == Memo.end()) {
+    SprigClass = FindBestSprigClass(Class, TComponentSprig::StaticClass());
+    Memo.emplace_back(Class, SprigClass);
+  }
+  if (!SprigClass) return nullptr;
+  TObjectGuard<TSprig> Sprig = NewSprig(SprigClass, AComponent);
+  static_cast<TComponentSprig*>(Sprig.Get())->SetOwner(this);
+  return Add(Sprig.Release());
+}
+
+bool TRootSprig::RepopulateAll() {
+  ClearNotes(); // the whole module is read: every note is answered by that
+  FWaiting.clear();
+  std::vector<TComponent*> Work = DesignedComponentsOf(dynamic_cast<TComponent*>(Item()));
+  SweepTree(this);
+  FIndex->Reserve(Work.size());
+  TClassMemo Memo;
+  bool Result = false;
+  for (TComponent* C : Work)
+    if (!FIndex->Find(C) && NewComponentSprig(C, Memo)) Result = true;
+  ValidateAll();
+  ClearUnneededSprigs();
+  ClearNotes();
+  FRepopulateAll = false;
+  FUnverified = false;
+  return Result;
+}
+
+bool TRootSprig::RepopulateNoted() {
+  FreeInvalidSprigs();
+  std::vector<TPersistent*> Inserted = std::exchange(FInserted, {});
+  std::unordered_set<const TPersistent*> Live = std::exchange(FInsertedLive, {});
+  auto* RootComponent = dynamic_cast<TComponent*>(Item());
+  TClassMemo Memo;
+  std::vector<TSprig*> Fresh;
+  for (TPersistent* P : Inserted) {
+    if (Live.erase(P) == 0) continue; // deleted since, or noted twice
+    TComponent* C = detail::AsComponent(P);
+    if (!C || FIndex->Find(C) || !ShowsInTree(C)) continue;
+    if (C->Owner() != RootComponent) {
+      // A component of a nested frame: the frame's sprig shows it.
+      if (TSprig* OwnerSprig = C->Owner() ? FIndex->Find(C->Owner()) : nullptr) FigureAgain(OwnerSprig);
+      continue;
+    }
+    if (TSprig* Sprig = NewComponentSprig(C, Memo)) Fresh.push_back(Sprig);
+  }
+  const bool Result = !Fresh.empty();
+  // Figuring may give a waiting sprig its parent, and so note more: until none is left.
+  do {
+    std::vector<TSprig*> Changed = std::exchange(FChanged, {});
+    std::erase_if(Changed, [&](TSprig* S) { return std::find(Fresh.begin(), Fresh.end(), S) != Fresh.end(); });
+    ValidateNoted(Fresh, Changed);
+    Fresh.clear();
+  } while (!FChanged.empty());
+  FreeInvalidSprigs();
+  return Result;
+}
+
 void TRootSprig::ValidateParent(TSprig* ASprig) {
   if (!ASprig || ASprig->Invalid()) return;
+  if (ASprig != this && ASprig->FValidatedPass != FPass) {
+    ASprig->FValidatedPass = FPass;
+    ++FPassFigured;
+  }
   TSprig* Before = ASprig->Parent();
   ASprig->FigureParent();
   if (ASprig->Parent() != Before) FParentChanges = true;
+  NoteWaiting(ASprig);
   ASprig->FigureChildren();
+}
+
+void TRootSprig::ValidateWalk(TSprig* ASprig) {
+  if (ASprig->Invalid()) return;
+  TSprig* Before = ASprig->Parent();
+  ValidateParent(ASprig);
+  // A sprig that moved is walked again under its new parent, later in this pass or in
+  // the next one, which its move asks for.
+  if (ASprig->Parent() != Before) return;
+  for (int I = ASprig->Count() - 1; I >= 0; --I)
+    if (I < ASprig->Count()) ValidateWalk(ASprig->Items(I));
+}
+
+void TRootSprig::ValidateAll() {
+  do {
+    FParentChanges = false;
+    ++FPass;
+    FPassFigured = FPassAttached = 0;
+    ValidateParent(this);
+    // The root's own children from the last: one that moves away leaves a hole, closed
+    // when the pass ends, so that a move costs the same at any place of a long list.
+    auto Close = Finally([this]() noexcept {
+      FVisiting = -1;
+      if (FList) std::erase(*FList, nullptr);
+    });
+    for (int I = Count() - 1; I >= 0; --I) {
+      if (I >= Count()) continue;
+      TSprig* Child = (*FList)[static_cast<std::size_t>(I)];
+      if (!Child) continue;
+      FVisiting = I;
+      ValidateWalk(Child);
+    }
+    // A parent is found through the index, not through the tree's shape: a pass that
+    // figured every sprig and attached none would figure the same parents again.
+    if (FPassAttached == 0 && FPassFigured == FAttached) break;
+  } while (FParentChanges);
+}
+
+void TRootSprig::ValidateNoted(const std::vector<TSprig*>& AFresh, const std::vector<TSprig*>& AChanged) {
+  do {
+    FParentChanges = false;
+    for (TSprig* Sprig : AChanged) {
+      if (Sprig->Invalid()) continue;
+      ValidateParent(Sprig);
+      // A collection's new items are figured with it; a component's children stay.
+      if (Sprig->SortByIndex())
+        for (int I = Sprig->Count() - 1; I >= 0; --I)
+          if (I < Sprig->Count()) ValidateWalk(Sprig->Items(I));
+    }
+    for (std::size_t I = AFresh.size(); I-- > 0;) ValidateWalk(AFresh[I]);
+  } while (FParentChanges);
 }
 
 void TRootSprig::RefreshTreeView() {
   BeginUpdate();
   auto Undo = OnFailure([this]() noexcept { --FUpdateLocks; });
+  if (FUnverified) FRepopulateNeeded = FRepopulateAll = true;
   if (FRepopulateNeeded) Repopulate();
   ForEach(nullptr, [this](TSprig* S) { PostRefreshTreeView(S); });
   Undo.Dismiss();
@@ -209,19 +336,96 @@ void TRootSprig::RefreshTreeView() {
 }
 
 //===----------------------------------------------------------------------===//
+// Pending work
+//===----------------------------------------------------------------------===//
+
+void TRootSprig::FigureAgain(TSprig* ASprig) {
+  if (!ASprig || ASprig->Invalid() || ASprig == this) return;
+  FRepopulateNeeded = true;
+  if (FRepopulateAll || std::find(FChanged.begin(), FChanged.end(), ASprig) != FChanged.end()) return;
+  FChanged.push_back(ASprig);
+}
+
+void TRootSprig::NoteInvalid(TSprig* ASprig) {
+  FInvalidSprigs.insert(ASprig);
+  FRepopulateNeeded = true;
+}
+
+void TRootSprig::SprigGone(TSprig* ASprig) noexcept {
+  FInvalidSprigs.erase(ASprig);
+  std::erase(FChanged, ASprig);
+}
+
+void TRootSprig::FreeInvalidSprigs() {
+  while (!FInvalidSprigs.empty()) {
+    TSprig* Sprig = *FInvalidSprigs.begin();
+    FInvalidSprigs.erase(FInvalidSprigs.begin());
+    TSprig* Parent = Sprig->Parent();
+    Sprig->Destroy();
+    // A transient sprig lives only while it has children.
+    while (Parent && Parent != this && Parent->Transient() && Parent->Count() == 0) {
+      TSprig* Up = Parent->Parent();
+      Parent->Destroy();
+      Parent = Up;
+    }
+  }
+}
+
+void TRootSprig::NoteWaiting(TSprig* ASprig) {
+  // Only a sprig that fell back to the root or its owner can be waiting for a parent.
+  TSprig* Parent = ASprig->Parent();
+  if (ASprig == this || !Parent || (Parent != this && Parent != ASprig->Owner())) return;
+  TComponent* Component = detail::AsComponent(ASprig->Item());
+  TComponent* ParentComponent = Component ? Component->GetParentComponent() : nullptr;
+  if (!ParentComponent || Parent->Item() == ParentComponent || FIndex->Find(ParentComponent)) return;
+  std::vector<const TPersistent*>& Waiting = FWaiting[ParentComponent];
+  if (std::find(Waiting.begin(), Waiting.end(), Component) == Waiting.end()) Waiting.push_back(Component);
+}
+
+void TRootSprig::ClearNotes() noexcept {
+  FInserted.clear();
+  FInsertedLive.clear();
+  FChanged.clear();
+  FInvalidSprigs.clear();
+}
+
+//===----------------------------------------------------------------------===//
 // Designer notifications
 //===----------------------------------------------------------------------===//
 
 void TRootSprig::ItemDeleted(TPersistent* AItem) {
+  FInsertedLive.erase(AItem);
+  FWaiting.erase(AItem);
   TSprig* Sprig = Find(AItem, true);
   if (!Sprig || Sprig == this || Sprig->Invalid()) return;
-  Sprig->Invalidate();
+  Sprig->Invalidate(); // notes itself for the next read
   FRepopulateNeeded = true;
 }
 
+void TRootSprig::ItemInserted(TPersistent* AItem) {
+  FRepopulateNeeded = true;
+  if (FRepopulateAll || !AItem) return;
+  if (FInsertedLive.insert(AItem).second) FInserted.push_back(AItem);
+}
+
+void TRootSprig::ItemInserted() { FRepopulateNeeded = FRepopulateAll = true; }
+
 void TRootSprig::ItemsModified(bool ADoRepopulate) {
-  if (ADoRepopulate) FRepopulateNeeded = true;
-  ForEach(nullptr, [this](TSprig* S) { PostRefreshTreeView(S); });
+  // A copy: sorting drops the sprigs of items that left a collection.
+  const std::vector<TSprig*> Sorted(FSortedSprigs.begin(), FSortedSprigs.end());
+  for (TSprig* Sprig : Sorted)
+    if (!Sprig->Invalid()) PostRefreshTreeView(Sprig);
+  if (!ADoRepopulate) return;
+  FRepopulateNeeded = true;
+  // What changed is not told: most likely the selection, which the designer edits, and
+  // the collections, whose items come and go without notice. A change elsewhere waits for
+  // the next refresh.
+  FUnverified = true;
+  for (TSprig* Sprig : Sorted) FigureAgain(Sprig);
+  if (!FDesigner) return;
+  IPtr<TDesignerSelections> Selected = New<TDesignerSelections>();
+  FDesigner->GetSelections(InterfaceOf<IDesignerSelections>(Selected.Get()));
+  for (int I = 0; I < Selected->GetCount(); ++I) FigureAgain(Find(Selected->Get(I), true));
 }
 
 //===----------------------------------------------------------------------===//

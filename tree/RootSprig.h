@@ -2,10 +2,13 @@
 //
 // `TRootSprig` tops the tree of one designed module: it owns the tree, keeps it
 // in step with the designer through the design notifications, and carries the
-// tree's selection to the designer. The tree is rebuilt lazily: a change marks
-// the root, and the next refresh repopulates it, keeping the sprigs that still
-// match. `TSprigIndex` finds a sprig by its item; `TRootSprigList` finds the
-// root sprig of a designer.
+// tree's selection to the designer. The tree is brought up to date lazily: a
+// change notification only notes what it concerns (an item inserted, a sprig
+// gone, the sprigs of the selection and of the collections after a change) and
+// the next read repopulates just those, in time independent of the module's
+// size; the first read, and a refresh after a change nobody described, go over
+// the whole module. `TSprigIndex` finds a sprig by its item; `TRootSprigList`
+// finds the root sprig of a designer.
 //
 // Example:
 //   InitDesignNotification();                 // the tree follows every designer
@@ -18,7 +21,6 @@
 
 #include "tree/TreeIntf.h"
 
-#include <array>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -28,21 +30,26 @@ namespace formkit {
 // TSprigIndex
 //===----------------------------------------------------------------------===//
 
-/// The sprigs of a tree by item: 256 buckets chosen by the second-lowest byte of the
-/// item's address. Does not own the sprigs.
+/// The sprigs of a tree by item, hashed on the item's address: a search costs the same
+/// in a module of ten components as in one of a hundred thousand. Does not own the
+/// sprigs; an item may have more than one, and the first added answers.
 class FK_API TSprigIndex : public TObject {
   FK_CLASS(TSprigIndex, TObject)
   TSprigIndex() = default;
   void Add(TSprig* ASprig);
   void Remove(TSprig* ASprig);
-  /// The first sprig of `AItem`, or null. Cost: one bucket.
+  /// The first sprig of `AItem`, or null.
   TSprig* Find(const TPersistent* AItem) const;
+  /// Makes room for `ACount` items at once.
+  void Reserve(std::size_t ACount) { FList.reserve(ACount); }
 
 private:
-  /// Each sprig beside its item, so that a search reads no sprig it does not return.
-  using TBucket = std::vector<std::pair<const TPersistent*, TSprig*>>;
-  static std::size_t BucketOf(const TPersistent* AItem) noexcept;
-  std::array<std::unique_ptr<TBucket>, 256> FList;
+  /// The sprigs of one item: the first, and the later ones in the rare case of several.
+  struct TEntry {
+    TSprig* First = nullptr;
+    std::unique_ptr<std::vector<TSprig*>> More;
+  };
+  std::unordered_map<const TPersistent*, TEntry> FList;
 };
 
 //===----------------------------------------------------------------------===//
@@ -95,9 +102,13 @@ class FK_API TRootSprig : public TPersistentSprig {
   void RemoveItem(TSprig* ASprig);
   /// Brings the tree in step with the module's components; true when sprigs were made.
   /// Sprigs for new components start under the root and move under their parents, pass
-  /// after pass, until a pass moves none. Cost: linear in the components, per pass.
+  /// after pass, until a pass moves none. The whole module is read the first time and
+  /// after `ItemInserted()`; otherwise only what the notifications noted since the last
+  /// read: the inserted items, the sprigs gone, the sprigs to figure again. Cost: linear
+  /// in what is read, per pass.
   bool Repopulate();
-  /// Repopulates when needed and sorts every child list, in one bracket.
+  /// Repopulates when needed and sorts every child list, in one bracket; after a change
+  /// of the module that no notification described, the whole module is read again.
   void RefreshTreeView();
   /// One step of a pass: the sprig figures its parent, then its children.
   void ValidateParent(TSprig* ASprig);
@@ -118,11 +129,19 @@ class FK_API TRootSprig : public TPersistentSprig {
 
   // Designer notifications ---------------------------------------------------
   /// Invalidates the sprig of `AItem` (never the root) and marks the tree; no rebuild.
+  /// The sprig is freed at the next repopulation.
   void ItemDeleted(TPersistent* AItem);
-  /// Marks the tree for repopulation.
-  void ItemInserted() { FRepopulateNeeded = true; }
-  /// Marks the tree when asked, and re-sorts the children by index.
+  /// Notes `AItem` for the next repopulation, which makes its sprig.
+  void ItemInserted(TPersistent* AItem);
+  /// Marks the whole tree for repopulation.
+  void ItemInserted();
+  /// Re-sorts the children of the sprigs that sort by index. When asked, marks the tree:
+  /// the next repopulation figures again the sprigs of the designer's selection and of the
+  /// collections, and the next refresh reads the whole module. Cost: the selection and
+  /// the collections' items, whatever the module's size.
   void ItemsModified(bool ADoRepopulate);
+  /// Notes `ASprig` to figure its parent and children again at the next repopulation.
+  void FigureAgain(TSprig* ASprig);
 
   // The host view's selection ------------------------------------------------
   /// The delete style of the selected sprigs and whether all of them are visible.
@@ -148,9 +167,36 @@ private:
   /// Calls `Fn` on each sprig selected in the host's view.
   void ForEachSelectedSprig(const std::function<void(TSprig*)>& Fn);
   bool CustomDeleteSelection();
-  /// Walks the tree, each sprig before its children and the children from the last:
-  /// frees invalid sprigs and collects the items of the others in `Shown`.
-  void SweepTree(TSprig* ASprig, std::unordered_set<TPersistent*>& Shown);
+  /// Walks the tree, each sprig before its children and the children from the last,
+  /// and frees the invalid sprigs.
+  void SweepTree(TSprig* ASprig);
+  /// The whole module: every component without a sprig gets one, every sprig is figured.
+  bool RepopulateAll();
+  /// Only what the notifications noted since the last read.
+  bool RepopulateNoted();
+  /// The answers of the registry during one read, by component class.
+  using TClassMemo = std::vector<std::pair<TClass, TSprigClass>>;
+  /// A sprig for `AComponent`, which has none, added under the root; null when no sprig
+  /// class takes it.
+  TSprig* NewComponentSprig(TComponent* AComponent, TClassMemo& Memo);
+  /// Validation passes until one moves none: over the new sprigs with their subtrees,
+  /// from the last, and over the sprigs noted to figure again (with a collection's items).
+  void ValidateNoted(const std::vector<TSprig*>& AFresh, const std::vector<TSprig*>& AChanged);
+  /// Validation passes over the whole tree until one moves none.
+  void ValidateAll();
+  /// One pass over a subtree, each sprig before its children and the children from the
+  /// last; the subtree of a sprig that moves is left to its new parent's turn.
+  void ValidateWalk(TSprig* ASprig);
+  /// An invalid sprig (the top of an invalid subtree) waits to be freed.
+  void NoteInvalid(TSprig* ASprig);
+  /// A sprig is being destroyed: no list of pending work keeps it.
+  void SprigGone(TSprig* ASprig) noexcept;
+  /// Frees the invalid sprigs noted, and transient parents left without children.
+  void FreeInvalidSprigs();
+  /// Notes that `ASprig` waits for a sprig of its parent component, which has none yet.
+  void NoteWaiting(TSprig* ASprig);
+  /// Forgets every piece of pending work.
+  void ClearNotes() noexcept;
 
   std::unique_ptr<TSprigIndex> FIndex;
   std::vector<TSprig*> FNamedItems;
@@ -163,6 +209,33 @@ private:
   bool FNeedUpdate = false;
   int FUpdateLocks = 0;
   IPtr<IOTAStructureContext> FStructureContext;
+
+  // Pending work of the next repopulation ------------------------------------------
+  /// The whole module must be read.
+  bool FRepopulateAll = true;
+  /// The module changed in a way nobody described: the next refresh reads all of it.
+  bool FUnverified = false;
+  /// Items inserted, in order, and which of them are still there.
+  std::vector<TPersistent*> FInserted;
+  std::unordered_set<const TPersistent*> FInsertedLive;
+  /// Sprigs to figure again.
+  std::vector<TSprig*> FChanged;
+  /// Invalid sprigs to free.
+  std::unordered_set<TSprig*> FInvalidSprigs;
+  /// Sprigs whose children stand by index: the collections.
+  std::unordered_set<TSprig*> FSortedSprigs;
+  /// Items of sprigs left elsewhere while their parent component had no sprig, by that
+  /// parent.
+  std::unordered_map<const TPersistent*, std::vector<const TPersistent*>> FWaiting;
+  /// While the root's own children are validated: the position of the child being
+  /// validated, whose extraction leaves a hole in the list until the pass ends.
+  int FVisiting = -1;
+  /// The valid sprigs attached to the tree, the root left out.
+  std::size_t FAttached = 0;
+  /// The current validation pass, the sprigs it figured and the sprigs it attached.
+  int FPass = 0;
+  std::size_t FPassFigured = 0;
+  std::size_t FPassAttached = 0;
 };
 
 //===----------------------------------------------------------------------===//

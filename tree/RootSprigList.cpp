@@ -111,10 +111,10 @@ void TRootSprigList::ItemDeleted(const IPtr<IDesigner>& ADesigner, TPersistent* 
   StructureChanged(Sprig, ADesigner);
 }
 
-void TRootSprigList::ItemInserted(const IPtr<IDesigner>& ADesigner, TPersistent*) {
+void TRootSprigList::ItemInserted(const IPtr<IDesigner>& ADesigner, TPersistent* AItem) {
   TRootSprig* Sprig = nullptr;
   if (!FindRoot(ADesigner, Sprig)) return;
-  Sprig->ItemInserted();
+  Sprig->ItemInserted(AItem);
   StructureChanged(Sprig, ADesigner);
 }
 

@@ -133,17 +133,28 @@ TSprig* TSprig::Add(TSprig* AItem) {
     AItem->FRoot = FRoot;
     FRoot->AddItem(AItem);
   }
-  if (FRoot) FRoot->FRepopulateNeeded = true;
+  // A sprig added from outside a repopulation has not been figured: the next one reads
+  // the whole module.
+  if (FRoot) {
+    FRoot->FRepopulateNeeded = true;
+    if (!FRoot->FRepopulating) FRoot->FRepopulateAll = true;
+  }
   return AItem;
 }
 
 void TSprig::Extract(TSprig* AItem) {
-  // From the back: repopulation appends new sprigs to the root and moves them away from
-  // the last to the first, so the one sought is near the end.
-  if (FList)
-    if (auto It = std::find(FList->rbegin(), FList->rend(), AItem); It != FList->rend())
-      FList->erase(std::next(It).base());
   AItem->FParent = nullptr;
+  if (!FList) return;
+  // While the root validates its own children, the one being validated leaves a hole
+  // that the pass closes at its end.
+  if (FRoot == this && FRoot->FVisiting >= 0 && FRoot->FVisiting < Count() &&
+      (*FList)[static_cast<std::size_t>(FRoot->FVisiting)] == AItem) {
+    (*FList)[static_cast<std::size_t>(FRoot->FVisiting)] = nullptr;
+    return;
+  }
+  // From the back: new sprigs are appended, so the one sought is mostly near the end.
+  if (auto It = std::find(FList->rbegin(), FList->rend(), AItem); It != FList->rend())
+    FList->erase(std::next(It).base());
 }
 
 TSprig* TSprig::Items(int Index) const {
@@ -196,6 +207,7 @@ TSprig* TSprig::FindItem(TPersistent* AItem, bool ARecurse) {
   if (AItem == FItem) return this;
   for (int I = 0; I < Count(); ++I) {
     TSprig* Child = Items(I);
+    if (!Child) continue; // a hole the root's validation pass is about to close
     if (Child->FItem == AItem) return Child;
     if (ARecurse)
       if (TSprig* Found = Child->FindItem(AItem, true)) return Found;
@@ -237,7 +249,7 @@ TSprig* TSprig::SeekParent(TPersistent* AItem, bool ARecurse) {
   if (!Found && FRoot) Found = FRoot->Find(AItem, ARecurse);
   if (Found) return Found;
   if (!FRoot) return nullptr;
-  auto* Component = dynamic_cast<TComponent*>(AItem);
+  TComponent* Component = detail::AsComponent(AItem);
   if (!Component) return FRoot;
   for (TComponent* O = Component->Owner(); O && !Found; O = O->Owner()) Found = FRoot->Find(O, ARecurse);
   return Found && Found->ParentOrphanedSprigs() ? Found : FRoot;
@@ -449,7 +461,7 @@ void TSprig::FigureParent() {
   if (PPropInfo Prop = ParentPropInfo(FItem ? FItem->ClassType() : nullptr))
     ParentObject = dynamic_cast<TPersistent*>(GetObjectProp(FItem, Prop));
   if (!ParentObject)
-    if (auto* Component = dynamic_cast<TComponent*>(FItem)) ParentObject = Component->GetParentComponent();
+    if (TComponent* Component = detail::AsComponent(FItem)) ParentObject = Component->GetParentComponent();
   if (ParentObject) {
     if (TSprig* NewParent = SeekParent(ParentObject, true)) NewParent->Add(this);
   } else if (TSprig* O = Owner()) {
@@ -472,7 +484,11 @@ void TSprig::FigureChildren() {
 void TSprig::Invalidate() {
   if (FInvalid) return;
   FInvalid = true;
-  if (FRoot) FRoot->RemoveItem(this);
+  if (FRoot) {
+    FRoot->RemoveItem(this);
+    // The top of an invalid subtree waits for the next repopulation to free it.
+    if (FRoot != this && !IsDestroying() && !(FParent && FParent->FInvalid)) FRoot->NoteInvalid(this);
+  }
   FItem = nullptr;
   for (int I = Count() - 1; I >= 0; --I) Items(I)->Invalidate();
 }
@@ -514,6 +530,7 @@ void TSprig::SetExpanded(bool AValue) {
 void TSprig::BeforeDestruction() {
   BeginDestruction();
   Invalidate();
+  if (FRoot && FRoot != this) FRoot->SprigGone(this);
   FItem = nullptr;
   ClearTreeNode(false, true);
   if (FParent) FParent->Extract(this);
@@ -553,7 +570,7 @@ void TComponentSprig::Create(TPersistent* AItem, TSprig* AOwner) {
 }
 
 String TComponentSprig::UniqueName() {
-  auto* Component = dynamic_cast<TComponent*>(Item());
+  TComponent* Component = detail::AsComponent(Item());
   if (!Component) return inherited::UniqueName();
   if (!Component->Name().empty()) return Component->Name();
   return Format("<Components[%d]>", Component->ComponentIndex());

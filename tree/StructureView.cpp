@@ -367,10 +367,13 @@ void TRootSprigStructureContext::DoInvoke(int AIndex) {
   case 0: Root->AddType(0); break;
   case 1: EditAction(eaDelete); break;
   case 3:
-  case 4:
-    // A move re-orders the tree: it is read again.
-    if (Root->Move(AIndex == 3)) Root->ItemInserted();
+  case 4: {
+    // A move re-orders the moved sprig's siblings: it is figured again.
+    TSprig* Moved = nullptr;
+    Root->SelectedSprig(Moved);
+    if (Root->Move(AIndex == 3)) Root->FigureAgain(Moved);
     break;
+  }
   default: break;
   }
   if (FRootSprig && FRootSprig->RepopulateNeeded()) V->StructureChanged(false);
@@ -478,7 +481,8 @@ void TRootSprigStructureContext::DoDragDrop(const IPtr<IOTAStructureNode>& ANode
     if (Sprig->Item()) Items.push_back(Sprig->Item());
     Dropped = Target->DragDrop(Sprig) || Dropped;
   }
-  if (Dropped) Root->ItemInserted(); // the tree is read again
+  if (Dropped) // the dropped sprigs take their new places at the next read
+    for (int I = 0; I < Dragged->Count(); ++I) Root->FigureAgain(Dragged->Sprigs(I));
   Root->SelectItems(Items, Dropped);
 }
 

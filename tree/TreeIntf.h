@@ -371,6 +371,8 @@ private:
   bool FCollectionsDone = false;
   bool FHidden = false;
   bool FHiddenTested = false;
+  /// The root's validation pass that last figured this sprig.
+  int FValidatedPass = 0;
   IPtr<IOTAStructureNode> FStructureNode;
 };
 
@@ -380,6 +382,14 @@ class FK_API TSprigTreeNode : public TTreeNode {
   TSprigTreeNode() = default;
   void BeforeDestruction() override;
 };
+
+namespace detail {
+/// `P` as a component, or null. Asks the class record: a tree reads this for every
+/// sprig on every pass, and a `dynamic_cast` across libraries costs several times more.
+inline TComponent* AsComponent(TPersistent* P) noexcept {
+  return P && P->InheritsFrom(TComponent::StaticClass()) ? static_cast<TComponent*>(P) : nullptr;
+}
+} // namespace detail
 
 /// A new sprig of `ASprigClass` on `AItem`, constructed through its virtual `Create`.
 [[nodiscard]] FK_API TObjectGuard<TSprig> NewSprig(TSprigClass ASprigClass, TPersistent* AItem);

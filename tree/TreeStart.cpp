@@ -22,6 +22,7 @@ TCopySprigGlyphFunc CopySprigGlyphFunc;
 
 namespace detail {
 void FreeRootSprigList() noexcept;
+void FreeCollectionProperties() noexcept;
 } // namespace detail
 
 namespace {
@@ -37,6 +38,7 @@ void StopTree() noexcept {
   DoneDesignNotification();
   detail::FreeRootSprigList();
   detail::StopSprigRegistries();
+  detail::FreeCollectionProperties();
   GIconCache.reset();
 }
 } // namespace

@@ -60,20 +60,24 @@ struct FormkitCommandTest : ::testing::Test {
   void WriteScript(const String& Name, const String& Text) { std::ofstream(At(Name)) << Text; }
 };
 
-TEST_F(FormkitCommandTest, TreeListsTheComponentsNestedAndNestedFramesWithTheirOwn) {
+TEST_F(FormkitCommandTest, TreePrintsTheStructureTreeWithCollectionsAndNestedFramesWithTheirOwn) {
+  // Controls stand under their parents, the frame's own components under the frame, the
+  // status bar's panels as a collection node under it; the captions name the classes.
   ASSERT_EQ(Run({"tree", At("Form2.kfm")}), feOK) << Err.str();
-  EXPECT_EQ(Out.str(), "Form2: TForm2\n"
-                       "  Panel1: TPanel\n"
-                       "    Label1: TLabel\n"
-                       "    Edit1: TEdit\n"
-                       "    CheckBox1: TCheckBox\n"
-                       "  Frame11: TFrame1\n"
-                       "    Label1: TLabel\n"
-                       "    Edit1: TEdit\n"
-                       "  Button1: TButton\n"
-                       "  Button2: TButton\n"
-                       "  StatusBar1: TStatusBar\n"
-                       "  Timer1: TTimer\n");
+  EXPECT_EQ(Out.str(), "Form2 (TForm2)\n"
+                       "  Panel1 (TPanel)\n"
+                       "    CheckBox1 (TCheckBox)\n"
+                       "    Edit1 (TEdit)\n"
+                       "    Label1 (TLabel)\n"
+                       "  Frame11 (TFrame1)\n"
+                       "    Label1 (TLabel)\n"
+                       "    Edit1 (TEdit)\n"
+                       "  Button1 (TButton)\n"
+                       "  Button2 (TButton)\n"
+                       "  StatusBar1 (TStatusBar)\n"
+                       "    Panels (TStatusPanels)\n"
+                       "  Timer1 (TTimer)\n");
+  EXPECT_EQ(Err.str(), "");
 }
 
 TEST_F(FormkitCommandTest, PropsShowsTheInspectorsListAndSetWritesThroughTheEditor) {
@@ -100,7 +104,7 @@ TEST_F(FormkitCommandTest, ConvertNewAndAnUneditedSaveKeepWhatTheyShould) {
   ASSERT_EQ(Run({"new", At("Form3.kfm"), "--inherit", "Form2"}), feOK) << Err.str();
   EXPECT_EQ(Read(At("Form3.fks")), "class TForm3 : TForm2\n");
   ASSERT_EQ(Run({"tree", At("Form3.kfm")}), feOK) << Err.str();
-  EXPECT_EQ(Out.str().substr(0, 31), "Form3: TForm3\n  Panel1: TPanel\n");
+  EXPECT_EQ(Out.str().substr(0, 33), "Form3 (TForm3)\n  Panel1 (TPanel)\n");
 }
 
 TEST_F(FormkitCommandTest, TheDemoDesignsByHandAndItsFilesReopenAsTheyWereLeft) {
@@ -280,6 +284,25 @@ TEST_F(ArrangeCommandTest, ViewsAreAddedSavedBesideTheModuleListedAndRemoved) {
   EXPECT_EQ(Out.str(), "Tall\t-\tForm1.Tall.kfm\n");
   ASSERT_EQ(Run({"views", At("Form1.kfm")}), feOK) << Err.str();
   EXPECT_EQ(Out.str(), "Tall\t-\tForm1.Tall.kfm\n");
+}
+
+} // namespace
+
+namespace {
+
+TEST_F(ArrangeCommandTest, AComponentDroppedOnANestedFrameBelongsToTheFrameAndIsSavedWithIt) {
+  // Frame11 stands at (8, 128) on Form1; the click at (300, 140) lands inside it.
+  WriteScript("frame.design", "open " + At("Form1.kfm") + "\n"
+                              "create TButton 300 140\n"
+                              "set Frame11.Button3.Caption Inside\n"
+                              "save\n");
+  ASSERT_EQ(Run({"run", At("frame.design")}), feOK) << Err.str();
+  EXPECT_EQ(Prop("Form1.kfm", "Frame11.Button3", "Caption"), "Inside");
+  EXPECT_EQ(Prop("Form1.kfm", "Frame11.Button3", "Left"), "296");
+  ASSERT_EQ(Run({"tree", At("Form1.kfm")}), feOK) << Err.str();
+  EXPECT_NE(Out.str().find("  Frame11 (TFrame1)\n    Label1 (TLabel)\n    Edit1 (TEdit)\n    Button3 (TButton)\n"),
+            String::npos)
+      << Out.str();
 }
 
 } // namespace

@@ -23,8 +23,11 @@ namespace {
 
 /// Whether the sprig's item is a control that takes child controls.
 bool AcceptsControls(const TSprig* Target) {
-  const auto* Control = dynamic_cast<const TControl*>(Target ? Target->Item() : nullptr);
-  return Control && Control->ControlStyle().Contains(csAcceptsControls);
+  // The class record answers: each new windowed control's sprig asks, and a tree of a
+  // large module makes many.
+  const TPersistent* Item = Target ? Target->Item() : nullptr;
+  if (!Item || !Item->InheritsFrom(TControl::StaticClass())) return false;
+  return static_cast<const TControl*>(Item)->ControlStyle().Contains(csAcceptsControls);
 }
 
 /// The image of a windowed control's sprig, by whether it takes child controls.
