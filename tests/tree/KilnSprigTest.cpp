@@ -269,8 +269,16 @@ TEST_F(KilnSprigTest, AFrameShowsTheComponentsItOwnsOnceAndKeepsThemToItself) {
   // The frame itself is a control of the form.
   EXPECT_TRUE(Root->DragDrop(FrameSprig));
   EXPECT_EQ(static_cast<TControl*>(Frame)->Parent(), Form1->GetRoot());
-  Changed(Form1);
+  Root = Changed(Form1);
   EXPECT_EQ(Tree(Form1), "Form1\n  Panel1\n  Label1\n  " + Name + "\n    Button1\n    Timer1\n");
+
+  // The form's label dropped on the frame stands in it and belongs to it, as it does when
+  // the module is read again; the module writes it there.
+  ASSERT_TRUE(Root->Find(Frame)->DragDrop(Root->Find(Label)));
+  EXPECT_EQ(Label->Parent(), Frame);
+  EXPECT_EQ(Label->Owner(), Frame);
+  EXPECT_EQ(Form1->GetRoot()->FindComponent("Label1"), nullptr);
+  EXPECT_NE(FormImage(Form1->GetRoot()).find("Label1"), String::npos);
 }
 
 } // namespace

@@ -229,6 +229,16 @@ class FK_API TKilnRoot : public TComponentRoot {
   /// The window that shows the module.
   TCustomForm* DesignWindow() const noexcept { return FWindow; }
 
+  // Owners of controls -------------------------------------------------------------------
+  /// Who owns what stands in `Parent`: the nearest nested frame above it that this module
+  /// may change, or the module's root. A nested frame's insides belong to the frame, as
+  /// they do when the module is read.
+  TComponent* OwnerWithin(TWinControl* Parent) const;
+  /// Gives a control of the module's own (not inherited) that moved into or out of a
+  /// nested frame the owner its new place asks for, renamed when the new owner holds its
+  /// name already; otherwise the module would not write it where it stands.
+  void KeepOwnerWithParent(TControl* Control);
+
   // Previews of views -------------------------------------------------------------------
   /// Draws the module's form into `Bitmap`, a `TBitmap` (anything else is left as it is):
   /// sized to the form, each control a framed rectangle with its name, in paint order.

@@ -22,25 +22,6 @@ private:
   IPtr<IComponentGuidelines> FGuides;
 };
 
-/// Who owns what stands in `Parent`: the nearest nested frame above it that the module
-/// may change, or the module's root. A nested frame's insides belong to the frame, as
-/// they do when the module is read.
-TComponent* OwnerWithin(TWinControl* Parent, TKilnRoot* Module) {
-  TComponent* Root = Module->Root();
-  for (TWinControl* P = Parent; P && P != Root; P = P->Parent())
-    if (P->ComponentState().Contains(csInline) && Module->ModifiableFrame(P)) return P;
-  return Root;
-}
-
-/// A name for `Component` that `Owner` does not hold yet: its own, or its class's with
-/// the first free number.
-String FreeNameIn(TComponent* Owner, TComponent* Component) {
-  if (!Owner->FindComponent(Component->Name())) return Component->Name();
-  String Base = Component->ClassName().substr(1);
-  for (int N = 1;; ++N)
-    if (String Name = Base + IntToStr(N); !Owner->FindComponent(Name)) return Name;
-}
-
 } // namespace
 
 FK_IMPLEMENT(TKilnItemGuides, "KilnDesign") {}
@@ -118,18 +99,7 @@ void TKilnControlItem::SetParent(const IPtr<IItem>& Parent) {
   auto* NewParent = dynamic_cast<TWinControl*>(ExtractComponent(Parent));
   if (!NewParent) return;
   if (NewParent != Control()->Parent()) Control()->SetParent(NewParent);
-  // A control of the module's own (not inherited) that moves into or out of a nested
-  // frame changes owner with it, or the module would not write it where it stands.
-  TComponent* Owner = Control()->Owner();
-  TKilnRoot* Module = FSurface->Root();
-  if (!Owner || Control()->ComponentState().Contains(csAncestor)) return;
-  if (Owner != Module->Root() && !Module->ModifiableFrame(Owner)) return;
-  TComponent* NewOwner = OwnerWithin(NewParent, Module);
-  if (NewOwner == Owner) return;
-  String Name = FreeNameIn(NewOwner, Control());
-  Owner->RemoveComponent(Control());
-  if (Name != Control()->Name()) Control()->ChangeName(Name);
-  NewOwner->InsertComponent(Control());
+  FSurface->Root()->KeepOwnerWithParent(Control());
 }
 
 void TKilnControlItem::Show() {

@@ -237,6 +237,39 @@ void TKilnRoot::FlipRootChildren(bool AllChildren) {
 }
 
 //===----------------------------------------------------------------------===//
+// Owners of controls in nested frames
+//===----------------------------------------------------------------------===//
+
+namespace {
+/// A name for `Component` that `Owner` does not hold yet: its own, or its class's with
+/// the first free number.
+String FreeNameIn(TComponent* Owner, TComponent* Component) {
+  if (!Owner->FindComponent(Component->Name())) return Component->Name();
+  String Base = Component->ClassName().substr(1);
+  for (int N = 1;; ++N)
+    if (String Name = Base + IntToStr(N); !Owner->FindComponent(Name)) return Name;
+}
+} // namespace
+
+TComponent* TKilnRoot::OwnerWithin(TWinControl* Parent) const {
+  for (TWinControl* P = Parent; P && P != FRoot; P = P->Parent())
+    if (P->ComponentState().Contains(csInline) && ModifiableFrame(P)) return P;
+  return FRoot;
+}
+
+void TKilnRoot::KeepOwnerWithParent(TControl* Control) {
+  TComponent* Owner = Control->Owner();
+  if (!Owner || !Control->Parent() || Control->ComponentState().Contains(csAncestor)) return;
+  if (Owner != FRoot && !ModifiableFrame(Owner)) return;
+  TComponent* NewOwner = OwnerWithin(Control->Parent());
+  if (NewOwner == Owner) return;
+  String Name = FreeNameIn(NewOwner, Control);
+  Owner->RemoveComponent(Control);
+  if (Name != Control->Name()) Control->ChangeName(Name);
+  NewOwner->InsertComponent(Control);
+}
+
+//===----------------------------------------------------------------------===//
 // Previews
 //===----------------------------------------------------------------------===//
 

@@ -8,6 +8,7 @@
 #include "frameworks/kiln/design/KilnSprigs.h"
 
 #include "frameworks/kiln/KilnForms.h"
+#include "frameworks/kiln/design/KilnDesign.h"
 #include "tree/SprigRegistry.h"
 
 namespace formkit {
@@ -69,6 +70,9 @@ bool ControlMove(TSprig* Target, TSprig* AItem) {
   auto* NewParent = dynamic_cast<TWinControl*>(Target->Item());
   if (!Control || !NewParent) return true; // a sprig whose item is gone moves nothing
   Control->SetParent(NewParent);
+  IPtr<IDesigner> Designer;
+  auto Module = AItem->GetDesigner(Designer) ? QueryAs<IInternalRoot>(Designer) : nullptr;
+  if (auto* Kiln = Module ? dynamic_cast<TKilnRoot*>(Module->Implementor()) : nullptr) Kiln->KeepOwnerWithParent(Control);
   const int Left = ClampInto(Control->Left(), Control->Width(), NewParent->ClientWidth());
   const int Top = ClampInto(Control->Top(), Control->Height(), NewParent->ClientHeight());
   Control->SetBounds(Left, Top, Control->Width(), Control->Height());
