@@ -20,6 +20,20 @@ struct RecoveryDialogsTest : ModuleFilesTest {
     if (TIDEWaitDialog::IsShowing()) TIDEWaitDialog::Hide();
     ModuleFilesTest::TearDown();
   }
+  /// Saves Form1, whose Label1 focuses Edit1 of Form2, and closes both: Form1 opened
+  /// alone then links to a module that is not open.
+  void SaveForm1LinkedToForm2() {
+    IPtr<IRoot> Form1 = NewFormAt("Form1");
+    IPtr<IRoot> Form2 = NewFormAt("Form2");
+    auto* Label =
+        static_cast<TLabel*>(KilnRoot(Form1)->CreateComponent(TLabel::StaticClass(), Form1->GetRoot(), 8, 8, 65, 17));
+    Label->SetFocusControl(static_cast<TWinControl*>(
+        KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 121, 23)));
+    KilnRoot(Form1)->Modified();
+    Form1->Save();
+    Form1->Close();
+    Form2->Close();
+  }
   /// Answers the next dialog by `Act` on its form, as `T`.
   template <class T> static void AnswerOn(std::function<TModalResult(T&)> Act) {
     DialogScript().AnswerBy([Act](TCustomForm& Form) { return Act(dynamic_cast<T&>(Form)); });
@@ -158,15 +172,7 @@ TEST_F(RecoveryDialogsTest, AnAncestorComponentLostOnTheWayIsRecoveredThroughThe
 }
 
 TEST_F(RecoveryDialogsTest, LinksGoToTheFirstOpenModuleThatHoldsWhatTheyNameOrAreRemoved) {
-  IPtr<IRoot> Form1 = NewFormAt("Form1");
-  IPtr<IRoot> Form2 = NewFormAt("Form2");
-  auto* Label = static_cast<TLabel*>(KilnRoot(Form1)->CreateComponent(TLabel::StaticClass(), Form1->GetRoot(), 8, 8, 65, 17));
-  Label->SetFocusControl(static_cast<TWinControl*>(
-      KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 121, 23)));
-  KilnRoot(Form1)->Modified();
-  Form1->Save();
-  Form1->Close();
-  Form2->Close();
+  SaveForm1LinkedToForm2();
   // Form3 lacks Edit1; Form4 and Form5 have it: Form4 comes first.
   IPtr<IRoot> Form3 = NewFormAt("Form3");
   IPtr<IRoot> Form5 = NewFormAt("Form5");
@@ -200,15 +206,7 @@ TEST_F(RecoveryDialogsTest, LinksGoToTheFirstOpenModuleThatHoldsWhatTheyNameOrAr
 }
 
 TEST_F(RecoveryDialogsTest, OkWithNothingChosenOrWithRemoveLinksDropsTheLinks) {
-  IPtr<IRoot> Form1 = NewFormAt("Form1");
-  IPtr<IRoot> Form2 = NewFormAt("Form2");
-  auto* Label = static_cast<TLabel*>(KilnRoot(Form1)->CreateComponent(TLabel::StaticClass(), Form1->GetRoot(), 8, 8, 65, 17));
-  Label->SetFocusControl(static_cast<TWinControl*>(
-      KilnRoot(Form2)->CreateComponent(TEdit::StaticClass(), Form2->GetRoot(), 8, 8, 121, 23)));
-  KilnRoot(Form1)->Modified();
-  Form1->Save();
-  Form1->Close();
-  Form2->Close();
+  SaveForm1LinkedToForm2();
   IPtr<IRoot> Alone = OpenAt("Form1.kfm");
   std::vector<String> Pending;
   GetFixupReferenceNames(Alone->GetRoot(), Pending);
