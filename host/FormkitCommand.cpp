@@ -2,6 +2,7 @@
 #include "host/FormkitCommand.h"
 
 #include "core/DesignIntfClasses.h"
+#include "host/AddinCommand.h"
 #include "host/DesignHost.h"
 #include "host/DesignScript.h"
 #include "host/DesktopRender.h"
@@ -45,6 +46,7 @@ const char* const MainHelp =
     "                                 lists, adds and removes the module's views\n"
     "  desktop render FILE OUT.png [--monitors SPEC]\n"
     "                                 draws the layout a desktop file saves\n"
+    "  addin FILE ACTION ARGUMENTS... lists and edits components as an add-in does\n"
     "\n"
     "'formkit SUBCOMMAND --help' tells more of each.\n"
     "\n"
@@ -268,6 +270,16 @@ const std::map<String, TSubcommand>& Subcommands() {
         "Draws the module at its own size into a PNG or an SVG file, the named components\n"
         "selected with their grab handles.\n",
         2, Render}},
+      {"addin",
+       {"FILE list | get NAME.PROP | set NAME.PROP VALUE | create CLASS [PARENT] | delete NAME",
+        ADDIN_COMMAND_HELP, 2,
+        [](const std::vector<String>& Args, std::ostream& Out) {
+          try {
+            RunAddinCommand(Args, Out);
+          } catch (const EAddinUsageError& E) {
+            throw EUsageError(E.Message());
+          }
+        }}},
       {"desktop",
        {"render FILE OUT.png|OUT.svg [--monitors SPEC]", DESKTOP_COMMAND_HELP, 3,
         [](const std::vector<String>& Args, std::ostream& Out) {

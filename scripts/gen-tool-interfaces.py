@@ -417,83 +417,11 @@ OPERATIONS = {
     """),
 
     # --- ToolsAPI: notifiers, editors, forms ---------------------------------------------
-    # IOTANotifier and IOTAEditor are declared with their operations in core/ToolServices.h.
-    "IOTAFormNotifier": ("Watches a form editor.", """
-        /// The form became the active one.
-        virtual void FormActivated() = 0;
-        /// The form is about to be written.
-        virtual void FormSaving() = 0;
-        /// A component of the form, or the form itself, was renamed.
-        virtual void ComponentRenamed(TOTAHandle ComponentHandle, const String& OldName,
-                                      const String& NewName) = 0;
-    """),
-    "IOTAEditorContent": ("The whole content of an editor as one stream.", """
-        /// A stream over the current content.
-        virtual IPtr<IStream> GetContent() = 0;
-        /// Replaces the content by that of `Content`.
-        virtual void SetContent(const IPtr<IStream>& Content) = 0;
-        /// The time of the content's last change.
-        virtual TDateTime GetContentAge() = 0;
-        /// Takes the current content as the one on disk.
-        virtual void ResetDiskAge() = 0;
-    """),
-    "INTAComponent": ("The framework object behind an `IOTAComponent`.", """
-        virtual TPersistent* GetPersistent() = 0;
-        /// The object when it is a component, else null.
-        virtual TComponent* GetComponent() = 0;
-    """),
-    "IOTAComponent": ("One object of a designed module.", """
-        /// The class name of the object.
-        virtual String GetComponentType() = 0;
-        /// The object's address, for `GetComponentFromHandle` of the form editor.
-        virtual TOTAHandle GetComponentHandle() = 0;
-        /// The visual parent, or null.
-        virtual IPtr<IOTAComponent> GetParent() = 0;
-        /// True when the object is a control of its framework.
-        virtual bool IsTControl() = 0;
-        /// The number of published properties.
-        virtual int GetPropCount() = 0;
-        /// The name of property `Index`; empty outside the range.
-        virtual String GetPropName(int Index) = 0;
-        /// The kind of property `Index`; `tkUnknown` outside the range.
-        virtual TTypeKind GetPropType(int Index) = 0;
-        /// The kind of the property named `Name`; `tkUnknown` for an unknown name.
-        virtual TTypeKind GetPropTypeByName(const String& Name) = 0;
-        /// Stores the value of property `Index` in the caller's buffer, laid out by its kind.
-        virtual bool GetPropValue(int Index, void* Value) = 0;
-        virtual bool GetPropValueByName(const String& Name, void* Value) = 0;
-        /// Sets property `Index` from the caller's buffer, laid out by its kind.
-        virtual bool SetProp(int Index, const void* Value) = 0;
-        virtual bool SetPropByName(const String& Name, const void* Value) = 0;
-        /// Calls `Proc` with `Param` for each child in stream order; false when not possible.
-        virtual bool GetChildren(void* Param, TOTAGetChildCallback Proc) = 0;
-        /// The number of controls parented by the object.
-        virtual int GetControlCount() = 0;
-        virtual IPtr<IOTAComponent> GetControl(int Index) = 0;
-        /// The number of components the object owns; -1 when it is no component.
-        virtual int GetComponentCount() = 0;
-        virtual IPtr<IOTAComponent> GetComponent(int Index) = 0;
-        /// Selects the object on its surface.
-        virtual bool Select(bool AddToSelection) = 0;
-        /// Selects the object and brings it into view for editing.
-        virtual bool Focus(bool AddToSelection) = 0;
-        /// Deletes the object from its module.
-        virtual bool Delete() = 0;
-    """),
-    "INTAFormEditor": ("The framework side of a form editor.", """
-        /// The designer of the form.
-        virtual IPtr<IDesigner> GetFormDesigner() = 0;
-        /// Writes the form's stream into `Stream` and rewinds it.
-        virtual void GetFormResource(TStream* Stream) = 0;
-    """),
+    # IOTANotifier, IOTAEditor, IOTAFormEditor, IOTAFormNotifier, IOTAEditorContent,
+    # IOTAComponent, INTAComponent, INTAFormEditor and IOTAModuleNotifier are declared with
+    # their operations in core/ToolServices.h.
 
     # --- ToolsAPI: modules and projects -------------------------------------------------
-    "IOTAModuleNotifier": ("Watches a module.", """
-        /// True when the module may overwrite its file.
-        virtual bool CheckOverwrite() = 0;
-        /// The module's file name became `NewName`.
-        virtual void ModuleRenamed(const String& NewName) = 0;
-    """),
     "IOTAModuleNotifier80": ("Watches a module: saving and the files it overwrites.", """
         /// True when the module may be saved now.
         virtual bool AllowSave() = 0;

@@ -4,6 +4,7 @@
 #include "core/CustomModules.h"
 #include "core/Designers.h"
 #include "core/DesignNotifications.h"
+#include "core/root/RootFormEditor.h"
 #include "platform/Filer.h"
 #include "platform/ScopeGuard.h"
 
@@ -124,6 +125,7 @@ TComponent* TComponentRoot::CreateRootAs(const String& ClassName, const String& 
 }
 
 void TComponentRoot::SetCreateInfo(const String& AncestorClassName, const IPtr<IRoot>& AncestorRoot) {
+  if (IPtr<IOTAModuleNotifier> Notifier = std::exchange(FAncestorRootNotifier, nullptr)) Notifier->Destroyed();
   IPtr<IRoot> Ancestor = AncestorRoot;
   if (!Ancestor && !FDesigner->IsRootBaseClass(AncestorClassName) && !AncestorClassName.empty()) {
     Ancestor = FDesigner->OpenRootClass(AncestorClassName);
@@ -133,6 +135,7 @@ void TComponentRoot::SetCreateInfo(const String& AncestorClassName, const IPtr<I
   if (FAncestorRoot) {
     FRootBaseClass = FAncestorRoot->GetRootBaseClass()->ClassName;
     FCustomModuleClass = FAncestorRoot->GetCustomModuleClass();
+    FAncestorRootNotifier = NewAs<IOTAModuleNotifier, TAncestorNotifier>(this);
   } else {
     FRootBaseClass = FDesigner->FindBaseClass(AncestorClassName);
     FCustomModuleClass = FDesigner->FindCustomModuleClass(AncestorClassName);
@@ -282,12 +285,17 @@ void TComponentRoot::InternalDeinitializeDesigner(bool GoingDormant) {
 void TComponentRoot::FreeRootStream() noexcept { FreeAndNil(FRootStream); }
 
 void TComponentRoot::BeforeDestruction() {
+  if (TOTAFormEditor* Editor = std::exchange(FOTAFormEditor, nullptr)) {
+    Editor->NotifyDestruct();
+    FOTAFormEditorRef = nullptr;
+  }
   FSelections = nullptr;
   FreeRootStream();
   FreeUndoStream();
   FreeAndNil(FDormantStream);
   ClearDependencies();
   ClearDependents();
+  if (IPtr<IOTAModuleNotifier> Notifier = std::exchange(FAncestorRootNotifier, nullptr)) Notifier->Destroyed();
   inherited::BeforeDestruction();
 }
 
@@ -323,6 +331,7 @@ void TComponentRoot::UpdateOptions() {
 
 void TComponentRoot::Modified() {
   FGeneratePreview = true;
+  if (FOTAFormEditor) FOTAFormEditor->FormModified();
   if (FModule) {
     FModule->Modified();
     FModule->Notify(ncFormModified);

@@ -37,6 +37,7 @@
 namespace formkit {
 
 class TReader;
+class TOTAFormEditor;
 
 FK_EXCEPTION(ECannotDeleteNonComponentException, EComponentDesignerException);
 
@@ -137,6 +138,10 @@ class FK_API TComponentRoot : public TInterfacedObject,
                               public IFlipChildren {
   FK_CLASS(TComponentRoot, TInterfacedObject)
   FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren)
+  // The tool facade (RootFormEditor.cpp) works on the module's streams and widget tree.
+  friend class TOTAFormEditor;
+  friend class TOTAComponent;
+  friend class TAncestorNotifier;
 
   /// What a module on design is made from.
   struct TCreateArgs {
@@ -169,6 +174,9 @@ class FK_API TComponentRoot : public TInterfacedObject,
   /// Whether `Component` is a nested frame whose insides this module may change.
   bool ModifiableFrame(TComponent* Component) const { return IsModifiableFrame(Component); }
   IPtr<IRoot> AsRoot() { return IPtr<IRoot>(static_cast<IInternalRoot*>(this)); }
+  /// The module's tool facade, made on first use and kept until the root goes
+  /// (RootFormEditor.cpp).
+  IPtr<IOTAFormEditor> GetFormEditor();
 
   // Lifecycle and state -------------------------------------------------------------------
   TClass GetRootClass() override;
@@ -645,6 +653,11 @@ protected:
   IPtr<IUpdateManager> FRootUpdateManager;
   IPtr<IInterfaceList> FUpdateManagers;
   IPtr<IInternalRoot> FAncestorRoot;
+  /// The tool facade: the object, and the one reference the root holds; null until asked.
+  TOTAFormEditor* FOTAFormEditor = nullptr;
+  IPtr<IOTAFormEditor> FOTAFormEditorRef;
+  /// Watches the ancestor's module, so that this root forgets an ancestor that goes.
+  IPtr<IOTAModuleNotifier> FAncestorRootNotifier;
   IPtr<IComponentEditor> FRootEditor;
   IPtr<ICustomModule> FCustomModule;
   String FFileSystem;

@@ -9,6 +9,7 @@
 //
 //===----------------------------------------------------------------------===//
 #include "core/root/ComponentRoot.h"
+#include "core/root/RootFormEditor.h"
 
 #include "platform/Filer.h"
 #include "platform/ScopeGuard.h"
@@ -47,6 +48,7 @@ TStream* TComponentRoot::GetRootStream() {
     return FDormantStream;
   }
   if (!FRootStream) {
+    if (FOTAFormEditor) FOTAFormEditor->FormSaving();
     if (FModule) {
       FModule->BeforeSave();
       FModule->Notify(ncFormSaving);

@@ -19,6 +19,7 @@
 #pragma once
 
 #include "core/ComponentDesignerIntf.h"
+#include "core/ToolUtils.h"
 #include "tests/fakes/CallLog.h"
 
 #include <set>
@@ -146,6 +147,14 @@ class TRecordingModule : public TInterfacedObject, public IDesignerViewModule, p
   // IOTAModule
   int GetModuleFileCount() override { return 1; }
   String GetModuleFileName(int) override { return FFileName; }
+  int AddNotifier(const IPtr<IOTAModuleNotifier>& Notifier) override {
+    return AddToList(Notifiers, QueryAs<IInterface>(Notifier));
+  }
+  void RemoveNotifier(int Index) override { Notifiers->Put(Index, nullptr); }
+  /// The module goes away: each of its notifiers hears `Destroyed`.
+  void TellDestroyed() { ForEach(Notifiers, &TOTAClass::NotifyDestroyed); }
+  /// The module's notifiers; an index is a handle.
+  IPtr<IInterfaceList> Notifiers = NewAs<IInterfaceList, TInterfaceList>();
 
   /// The description `LastCompInfo` holds of `Info`.
   static String Describe(const IPtr<ICompInfo>& Info) {
