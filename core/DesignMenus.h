@@ -7,6 +7,7 @@
 //===----------------------------------------------------------------------===//
 #pragma once
 
+#include "platform/Classes.h"
 #include "platform/TypInfo.h"
 
 namespace formkit {
@@ -17,9 +18,22 @@ FK_SET(TLocalMenuTypes, TLocalMenuType)
 /// The local menus that a module offers by default.
 inline constexpr TLocalMenuTypes CLocalMenusIf{lmBase, lmModule, lmSelection, lmComponent};
 
-/// The collection side of a menu.
+struct IMenuItem;
+
+/// The collection side of a menu: its items, and the making of new ones.
 struct FK_API IMenuItems : IInterface {
   FK_INTERFACE(IMenuItems, IInterface, "{4DE1A7A2-0EAD-5065-83A7-9DC3C5D2BF9E}")
+  /// Adds an item that runs `Action`, a framework action the menu does not own, named
+  /// `Name`; gives the new item.
+  virtual IPtr<IMenuItem> AddItem(TComponent* Action, const String& Name) = 0;
+  /// Adds a separator named `Name`.
+  virtual IPtr<IMenuItem> AddLine(const String& Name) = 0;
+  /// Inserts a separator at `Index`.
+  virtual IPtr<IMenuItem> InsertLine(int Index, const String& Name) = 0;
+  /// The number of items.
+  virtual int GetCount() = 0;
+  /// Item `Index`; the menu layer raises for an index outside its items.
+  virtual IPtr<IMenuItem> GetItem(int Index) = 0;
 };
 struct FK_API IMenu : IInterface {
   FK_INTERFACE(IMenu, IInterface, "{4214BC72-00B4-5F5F-989B-C21B9E916BF2}")
@@ -30,8 +44,18 @@ struct FK_API IMainMenu : IMenu {
 struct FK_API IPopupMenu : IMenu {
   FK_INTERFACE(IPopupMenu, IMenu, "{C004F6C0-3ACF-55D5-BDC0-744DC9DA8224}")
 };
+/// One item of a menu, with its own sub-items.
 struct FK_API IMenuItem : IMenuItems {
   FK_INTERFACE(IMenuItem, IMenuItems, "{97256079-5A09-5E47-8DFC-D850DC2A2EFA}")
+  virtual String GetCaption() = 0;
+  virtual String GetName() = 0;
+  virtual bool GetChecked() = 0;
+  virtual bool GetEnabled() = 0;
+  virtual bool GetVisible() = 0;
+  /// Whether the item is a separator line.
+  virtual bool GetIsLine() = 0;
+  /// The action the item runs, or null; not owned.
+  virtual TComponent* GetAction() = 0;
 };
 struct FK_API IMenuItem2 : IMenuItem {
   FK_INTERFACE(IMenuItem2, IMenuItem, "{F5C3E3AF-99FE-57F7-8435-FCE6885C771F}")

@@ -308,6 +308,7 @@ void RegisterDefaultEditors() {
   RegisterPropertyEditor(TypeInfo_TDateTime(), nullptr, "", TDateTimeProperty::StaticClass());
   RegisterPropertyEditor(InterfaceTypeInfo<IInterface>(), nullptr, "", TInterfaceProperty::StaticClass());
   RegisterPropertyEditor(TCollection::StaticClass()->TypeInfo(), nullptr, "", TCollectionProperty::StaticClass());
+  RegisterSelectionEditor(TPersistent::StaticClass(), TEditActionSelectionEditor::StaticClass());
 }
 
 } // namespace detail

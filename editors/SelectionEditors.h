@@ -15,6 +15,8 @@
 
 #include "core/DesignIntf.h"
 
+#include <functional>
+
 namespace formkit {
 
 /// The base of selection editors: no verbs, no units. Counted; made through the virtual
@@ -34,6 +36,38 @@ class FK_API TSelectionEditor : public TBaseSelectionEditor, public ISelectionEd
 
 protected:
   IPtr<IDesigner> FDesigner;
+};
+
+FK_RESOURCESTRING(sEditSubmenu, "Edit");
+FK_RESOURCESTRING(sControlSubmenu, "Control");
+
+/// The host's action list, whose owner holds the environment's commands by name
+/// ("EditCutCommand"); null unless a host sets it.
+FK_API extern std::function<TComponent*()> GetIDEActionListFunc;
+
+/// The edit commands of every selection: an "Edit" submenu of the host's undo, clipboard,
+/// delete and select-all commands, and a "Control" submenu of its stacking commands.
+/// Registered for `TPersistent` as the library starts.
+class FK_API TEditActionSelectionEditor : public TSelectionEditor {
+  FK_CLASS(TEditActionSelectionEditor, TSelectionEditor)
+  int GetVerbCount() override { return 2; }
+  /// `sEditSubmenu` and `sControlSubmenu`.
+  String GetVerb(int Index) override;
+  /// Fills verb 0 with the host's edit commands, verb 1 with its stacking commands; a
+  /// command the host does not have is left out.
+  void PrepareItem(int Index, const IPtr<IMenuItem>& AItem) override;
+  /// Hands `Action` to the host's top-level window when it takes edit commands, else to
+  /// the designer when it does; else nothing.
+  void EditAction(TEditAction Action);
+  /// The designer's edit state when it answers, else the top-level window's; all of undo,
+  /// redo, cut, copy, paste and delete when neither does.
+  TEditState GetEditState();
+  void HandleUndo(TObject*) { EditAction(eaUndo); }
+  void HandleCut(TObject*) { EditAction(eaCut); }
+  void HandleCopy(TObject*) { EditAction(eaCopy); }
+  void HandlePaste(TObject*) { EditAction(eaPaste); }
+  void HandleDelete(TObject*) { EditAction(eaDelete); }
+  void HandleSelectAll(TObject*) { EditAction(eaSelectAll); }
 };
 
 /// The selection editors made for one selection, in registration order.

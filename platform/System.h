@@ -191,6 +191,8 @@ FK_EXCEPTION(EListError, Exception);
 FK_EXCEPTION(EStringListError, Exception);
 FK_EXCEPTION(EInvalidOperation, Exception);
 FK_EXCEPTION(EInvalidCast, Exception);
+/// The message of a class cast that does not hold.
+FK_RESOURCESTRING(SInvalidCast, "Invalid class typecast");
 FK_EXCEPTION(EIntfCastError, Exception);
 FK_EXCEPTION(EInvalidPointer, Exception);
 FK_EXCEPTION(ENonAIRException, Exception);

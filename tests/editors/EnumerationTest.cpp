@@ -157,18 +157,21 @@ TEST_F(EnumerationTest, SelectionEditorsMatchTheNearestCommonAncestorInRegistrat
   Two->Add(Shy);
   Two->Add(G);
   IPtr<ISelectionEditorList> Editors = GetSelectionEditors(Designer(), Two);
-  ASSERT_EQ(Editors->GetCount(), 2);
-  EXPECT_TRUE(QueryAs<ISelectionPropertyFilter>(Editors->Get(0)));
-  EXPECT_EQ(Editors->Get(1)->GetVerbCount(), 0);
+  // The library's edit commands (registered for every persistent) come first.
+  ASSERT_EQ(Editors->GetCount(), 3);
+  EXPECT_EQ(Editors->Get(0)->GetVerb(0), "Edit");
+  EXPECT_EQ(Editors->Get(0)->GetVerb(1), "Control");
+  EXPECT_TRUE(QueryAs<ISelectionPropertyFilter>(Editors->Get(1)));
+  EXPECT_EQ(Editors->Get(2)->GetVerbCount(), 0);
   Two->Add(O);
-  EXPECT_EQ(GetSelectionEditors(Designer(), Two)->GetCount(), 1);
+  EXPECT_EQ(GetSelectionEditors(Designer(), Two)->GetCount(), 2);
   EXPECT_EQ(GetSelectionEditors(Designer(), CreateSelectionList())->GetCount(), 0);
-  EXPECT_EQ(GetSelectionEditors(Designer(), O)->GetCount(), 1);
+  EXPECT_EQ(GetSelectionEditors(Designer(), O)->GetCount(), 2);
   try {
-    (void)Editors->Get(2);
+    (void)Editors->Get(3);
     ADD_FAILURE();
   } catch (const EListError& E) {
-    EXPECT_EQ(E.Message(), "List index out of bounds (2)");
+    EXPECT_EQ(E.Message(), "List index out of bounds (3)");
   }
 }
 

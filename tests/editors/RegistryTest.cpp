@@ -183,14 +183,16 @@ TEST_F(RegistryTest, FreeingAGroupDropsItsComponentAndSelectionEditorsAndMappers
   RegisterSelectionEditor(TComponent::StaticClass(), TSelectionEditor::StaticClass());
   ASSERT_EQ(ComponentClassList().size(), 1u);
   EXPECT_EQ(ComponentClassList()[0].Group, Group);
-  ASSERT_EQ(SelectionEditorDefinitions().size(), 2u);
-  EXPECT_TRUE(SelectionEditorDefinitions()[0]->Matches(TShyGadget::StaticClass()));
-  EXPECT_FALSE(SelectionEditorDefinitions()[0]->Matches(TOtherGadget::StaticClass()));
+  // The library's own edit commands come first, for every selection.
+  ASSERT_EQ(SelectionEditorDefinitions().size(), 3u);
+  EXPECT_EQ(SelectionEditorDefinitions()[0]->Editor(), TEditActionSelectionEditor::StaticClass());
+  EXPECT_TRUE(SelectionEditorDefinitions()[1]->Matches(TShyGadget::StaticClass()));
+  EXPECT_FALSE(SelectionEditorDefinitions()[1]->Matches(TOtherGadget::StaticClass()));
   FreeEditorGroup(Group);
   EXPECT_TRUE(ComponentClassList().empty());
   EXPECT_TRUE(PropertyMapperList().empty());
-  ASSERT_EQ(SelectionEditorDefinitions().size(), 1u);
-  EXPECT_EQ(SelectionEditorDefinitions()[0]->Group(), -1);
+  ASSERT_EQ(SelectionEditorDefinitions().size(), 2u);
+  EXPECT_EQ(SelectionEditorDefinitions()[1]->Group(), -1);
 }
 
 TEST_F(RegistryTest, AClassRegisteredAsAnEditorOfAnotherKindIsRefusedWhenMade) {
