@@ -40,7 +40,7 @@ FK_RESOURCESTRING(sDesktopCannotRead, "Cannot read the desktop \"%s\": %s");
 FK_RESOURCESTRING(sDesktopNotADesktop, "\"%s\" is no desktop file: %s");
 FK_RESOURCESTRING(sDesktopUnknownAction, "Unknown action '%s' of 'formkit desktop'. Try 'formkit desktop --help'.");
 
-/// The task bar a monitor has when its specification gives none, in pixels.
+/// The task bar a monitor has when the monitor set given names none, in pixels.
 inline constexpr int DefaultTaskbarHeight = 40;
 
 // The colours of the picture, plain 0x00BBGGRR values.
