@@ -6,14 +6,7 @@
 // with its message and exit code, and no file changed by it.
 //
 //===----------------------------------------------------------------------===//
-#include "host/FormkitCommand.h"
-
-#include <gtest/gtest.h>
-
-#include <filesystem>
-#include <fstream>
-#include <map>
-#include <sstream>
+#include "tests/host/ExamplesFixture.h"
 
 using namespace formkit;
 
@@ -21,44 +14,17 @@ namespace {
 
 namespace fs = std::filesystem;
 
-struct AddinCommandTest : ::testing::Test {
-  fs::path Dir;
-  std::ostringstream Out, Err;
-
-  void SetUp() override {
-    char Template[] = "/tmp/fk-addin-XXXXXX";
-    ASSERT_NE(::mkdtemp(Template), nullptr);
-    Dir = Template;
-    for (const auto& Entry : fs::directory_iterator(FK_EXAMPLES_DIR))
-      if (Entry.is_regular_file()) fs::copy_file(Entry.path(), Dir / Entry.path().filename());
-  }
-  void TearDown() override {
-    std::error_code Ignored;
-    fs::remove_all(Dir, Ignored);
-  }
+struct AddinCommandTest : hosttest::ExamplesFixture {
   String Form1() const { return (Dir / "Form1.kfm").string(); }
   /// `formkit addin Form1.kfm Args...`.
   int Addin(std::vector<String> Args) {
     Args.insert(Args.begin(), {"addin", Form1()});
-    Out.str("");
-    Err.str("");
-    return RunFormkit(Args, Out, Err);
+    return Run(std::move(Args));
   }
   /// The text a `get` prints, or the error it gives.
   String Get(const String& Path) {
     int Code = Addin({"get", Path});
     return Code == feOK ? Out.str() : "exit " + std::to_string(Code) + ": " + Err.str();
-  }
-  static String Read(const fs::path& Path) {
-    std::ifstream In(Path, std::ios::binary);
-    std::ostringstream S;
-    S << In.rdbuf();
-    return S.str();
-  }
-  std::map<String, String> Files() const {
-    std::map<String, String> All;
-    for (const auto& Entry : fs::directory_iterator(Dir)) All[Entry.path().filename().string()] = Read(Entry.path());
-    return All;
   }
 };
 

@@ -7,7 +7,7 @@
 //
 //===----------------------------------------------------------------------===//
 #include "host/DesignHost.h"
-#include "host/FormkitCommand.h"
+#include "tests/host/ExamplesFixture.h"
 
 #include <gtest/gtest.h>
 
@@ -22,43 +22,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-struct FormkitCommandTest : ::testing::Test {
-  fs::path Dir;
-  fs::path Home = fs::current_path();
-  std::ostringstream Out, Err;
-
-  void SetUp() override {
-    char Template[] = "/tmp/fk-command-XXXXXX";
-    ASSERT_NE(::mkdtemp(Template), nullptr);
-    Dir = Template;
-    for (const auto& Entry : fs::directory_iterator(FK_EXAMPLES_DIR))
-      if (Entry.is_regular_file()) fs::copy_file(Entry.path(), Dir / Entry.path().filename());
-  }
-  void TearDown() override {
-    std::error_code Ignored;
-    fs::current_path(Home, Ignored);
-    fs::remove_all(Dir, Ignored);
-  }
-  String At(const String& File) const { return (Dir / File).string(); }
-  int Run(std::vector<String> Args) {
-    Out.str("");
-    Err.str("");
-    return RunFormkit(Args, Out, Err);
-  }
-  static String Read(const String& Path) {
-    std::ifstream In(Path, std::ios::binary);
-    std::ostringstream S;
-    S << In.rdbuf();
-    return S.str();
-  }
-  /// Every file of the scratch directory with its bytes.
-  std::map<String, String> Files() const {
-    std::map<String, String> All;
-    for (const auto& Entry : fs::directory_iterator(Dir)) All[Entry.path().filename().string()] = Read(Entry.path().string());
-    return All;
-  }
-  void WriteScript(const String& Name, const String& Text) { std::ofstream(At(Name)) << Text; }
-};
+using FormkitCommandTest = hosttest::ExamplesFixture;
 
 TEST_F(FormkitCommandTest, TreePrintsTheStructureTreeWithCollectionsAndNestedFramesWithTheirOwn) {
   // Controls stand under their parents, the frame's own components under the frame, the
