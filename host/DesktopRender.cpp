@@ -34,15 +34,15 @@ namespace {
 //===----------------------------------------------------------------------===//
 
 /// Reads a monitor set left to right.
-class TMonitorSpecReader {
+class TMonitorSetReader {
 public:
-  explicit TMonitorSpecReader(const String& Spec) : FSpec(Spec) {}
+  explicit TMonitorSetReader(const String& Text) : FText(Text) {}
 
   std::vector<TMonitorInfo> Read() {
     std::vector<TMonitorInfo> Monitors;
     do Monitors.push_back(ReadMonitor());
     while (Take(','));
-    if (FPos != FSpec.size()) Fail("unexpected '" + FSpec.substr(FPos, 1) + "'");
+    if (FPos != FText.size()) Fail("unexpected '" + FText.substr(FPos, 1) + "'");
     int Primaries =
         static_cast<int>(std::count_if(Monitors.begin(), Monitors.end(), [](auto& M) { return M.Primary; }));
     if (Primaries > 1) Fail("more than one monitor is marked primary");
@@ -77,23 +77,23 @@ private:
 
   int ReadNumber(const String& What, bool Signed = false) {
     std::size_t Start = FPos;
-    if (Signed && FPos < FSpec.size() && FSpec[FPos] == '-') ++FPos;
+    if (Signed && FPos < FText.size() && FText[FPos] == '-') ++FPos;
     std::size_t Digits = FPos;
-    while (FPos < FSpec.size() && FSpec[FPos] >= '0' && FSpec[FPos] <= '9') ++FPos;
+    while (FPos < FText.size() && FText[FPos] >= '0' && FText[FPos] <= '9') ++FPos;
     if (FPos == Digits) Fail(What + " is missing");
     if (FPos - Digits > 6) Fail(What + " is too large");
-    return std::stoi(FSpec.substr(Start, FPos - Start));
+    return std::stoi(FText.substr(Start, FPos - Start));
   }
 
   bool Take(char C) {
-    if (FPos >= FSpec.size() || FSpec[FPos] != C) return false;
+    if (FPos >= FText.size() || FText[FPos] != C) return false;
     ++FPos;
     return true;
   }
 
-  [[noreturn]] void Fail(const String& Why) const { throw EDesktopUsageError(sDesktopBadMonitors, FSpec, Why); }
+  [[noreturn]] void Fail(const String& Why) const { throw EDesktopUsageError(sDesktopBadMonitors, FText, Why); }
 
-  const String& FSpec;
+  const String& FText;
   std::size_t FPos = 0;
 };
 
@@ -516,7 +516,7 @@ template <class TCanvas> String PaintScreen() {
 // Entry points
 //===----------------------------------------------------------------------===//
 
-std::vector<TMonitorInfo> ParseMonitorSpec(const String& Spec) { return TMonitorSpecReader(Spec).Read(); }
+std::vector<TMonitorInfo> ParseMonitorSet(const String& Text) { return TMonitorSetReader(Text).Read(); }
 
 void RenderDesktopToFile(const String& DesktopFile, const std::vector<TMonitorInfo>& Monitors, const String& FileName) {
   TRenderFormat Format = RenderFormatOf(FileName);
@@ -539,11 +539,11 @@ void RunDesktopCommand(const std::vector<String>& Args, std::ostream&) {
   if (Args.empty() || Args[0] != "render")
     throw EDesktopUsageError(sDesktopUnknownAction, Args.empty() ? String() : Args[0]);
   std::vector<String> Files;
-  String Spec = "1920x1080";
+  String Monitors = "1920x1080";
   for (std::size_t I = 1; I < Args.size(); ++I) {
     if (Args[I] == "--monitors") {
       if (I + 1 >= Args.size()) throw EDesktopUsageError(sDesktopMissingValue, Args[I]);
-      Spec = Args[++I];
+      Monitors = Args[++I];
     } else if (Args[I].rfind("--", 0) == 0 || Files.size() == 2) {
       throw EDesktopUsageError(sDesktopUnknownOption, Args[I]);
     } else {
@@ -551,7 +551,7 @@ void RunDesktopCommand(const std::vector<String>& Args, std::ostream&) {
     }
   }
   if (Files.size() < 2) throw EDesktopUsageError(sDesktopMissingArguments);
-  RenderDesktopToFile(Files[0], ParseMonitorSpec(Spec), Files[1]);
+  RenderDesktopToFile(Files[0], ParseMonitorSet(Monitors), Files[1]);
 }
 
 } // namespace formkit

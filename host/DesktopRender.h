@@ -17,7 +17,7 @@
 // which otherwise is the first.
 //
 // Example:
-//   RenderDesktopToFile("layout.dsk", ParseMonitorSpec("2560x1440*,1920x1080@-1920,0"),
+//   RenderDesktopToFile("layout.dsk", ParseMonitorSet("2560x1440*,1920x1080@-1920,0"),
 //                       "layout.png");
 //
 //===----------------------------------------------------------------------===//
@@ -60,7 +60,7 @@ inline constexpr std::int32_t DesktopActiveTabColor = 0xFFFFFF;   ///< the selec
 /// Reads a monitor set; raises `EDesktopUsageError` `sDesktopBadMonitors` with the
 /// reason for a malformed one (no monitor, a size below 1, a task bar that leaves no
 /// work area, a resolution below 1, two primaries).
-[[nodiscard]] FK_API std::vector<TMonitorInfo> ParseMonitorSpec(const String& Spec);
+[[nodiscard]] FK_API std::vector<TMonitorInfo> ParseMonitorSet(const String& Text);
 
 /// Loads `DesktopFile` onto `Monitors` and draws it into `FileName`, a PNG or an SVG by
 /// its extension, which is written beside itself first and moved into place. The
@@ -73,7 +73,7 @@ inline constexpr std::int32_t DesktopActiveTabColor = 0xFFFFFF;   ///< the selec
 FK_API void RenderDesktopToFile(const String& DesktopFile, const std::vector<TMonitorInfo>& Monitors,
                                 const String& FileName);
 
-/// `formkit desktop` with its arguments (`render FILE OUT [--monitors SPEC]`). Raises
+/// `formkit desktop` with its arguments (`render FILE OUT [--monitors MONITORS]`). Raises
 /// `EDesktopUsageError` for an unknown action or option or a missing value, and what
 /// `RenderDesktopToFile` raises.
 FK_API void RunDesktopCommand(const std::vector<String>& Args, std::ostream& Out);
@@ -85,7 +85,7 @@ FK_API void RunDesktopCommand(const std::vector<String>& Args, std::ostream& Out
   "monitors, into a PNG or an SVG file. The file is loaded as the environment loads it, so\n"                          \
   "every window lands where the environment would put it on those monitors.\n"                                         \
   "\n"                                                                                                                 \
-  "  --monitors SPEC   monitors as WIDTHxHEIGHT[@LEFT,TOP][/TASKBAR][:DPI][*], separated by\n"                         \
+  "  --monitors MONITORS   monitors as WIDTHxHEIGHT[@LEFT,TOP][/TASKBAR][:DPI][*], separated by\n"                         \
   "                    commas; TASKBAR is the height of the bar at the bottom (40), * marks the\n"                     \
   "                    primary monitor (else the first). Default: 1920x1080.\n"                                        \
   "                    Example: --monitors 1920x1080,1280x1024@1920,0/0\n"

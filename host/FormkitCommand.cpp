@@ -44,7 +44,7 @@ const char* const MainHelp =
     "  revert FILE NAME... [--yes|--no]  gives inherited components their ancestor's values\n"
     "  views FILE [--add NAME]... [--remove NAME]...\n"
     "                                 lists, adds and removes the module's views\n"
-    "  desktop render FILE OUT.png [--monitors SPEC]\n"
+    "  desktop render FILE OUT.png [--monitors MONITORS]\n"
     "                                 draws the layout a desktop file saves\n"
     "  addin FILE ACTION ARGUMENTS... lists and edits components as an add-in does\n"
     "\n"
@@ -281,7 +281,7 @@ const std::map<String, TSubcommand>& Subcommands() {
           }
         }}},
       {"desktop",
-       {"render FILE OUT.png|OUT.svg [--monitors SPEC]", DESKTOP_COMMAND_HELP, 3,
+       {"render FILE OUT.png|OUT.svg [--monitors MONITORS]", DESKTOP_COMMAND_HELP, 3,
         [](const std::vector<String>& Args, std::ostream& Out) {
           try {
             RunDesktopCommand(Args, Out);

@@ -282,7 +282,7 @@ TEST_F(DesktopRenderTest, UsageErrorsExitWithTwo) {
   String Fine = At("fine.dsk");
   std::ofstream(Fine) << "[Messages]\nCreate=1\nVisible=1\n";
   EXPECT_EQ(Run({"desktop"}, &Err), feUsage);
-  EXPECT_EQ(Err, "'formkit desktop' needs render FILE OUT.png|OUT.svg [--monitors SPEC]. "
+  EXPECT_EQ(Err, "'formkit desktop' needs render FILE OUT.png|OUT.svg [--monitors MONITORS]. "
                  "Try 'formkit desktop --help'.\n");
   EXPECT_EQ(Run({"desktop", "paint", Fine, At("out.png")}, &Err), feUsage);
   EXPECT_EQ(Err, "Unknown action 'paint' of 'formkit desktop'. Try 'formkit desktop --help'.\n");
@@ -300,14 +300,14 @@ TEST_F(DesktopRenderTest, UsageErrorsExitWithTwo) {
   EXPECT_FALSE(fs::exists(At("out.png")));
   std::ostringstream Out, Ignored;
   EXPECT_EQ(RunFormkit({"desktop", "--help"}, Out, Ignored), feOK);
-  EXPECT_NE(Out.str().find("--monitors SPEC"), String::npos);
+  EXPECT_NE(Out.str().find("--monitors MONITORS"), String::npos);
   std::ostringstream Main;
   EXPECT_EQ(RunFormkit({"--help"}, Main, Ignored), feOK);
-  EXPECT_NE(Main.str().find("desktop render FILE OUT.png [--monitors SPEC]"), String::npos);
+  EXPECT_NE(Main.str().find("desktop render FILE OUT.png [--monitors MONITORS]"), String::npos);
 }
 
 TEST_F(DesktopRenderTest, MonitorSetsAreReadWithTheirPlacesTaskBarsResolutionsAndPrimary) {
-  std::vector<TMonitorInfo> M = ParseMonitorSpec("1920x1080,1280x1024@1920,0/0:144");
+  std::vector<TMonitorInfo> M = ParseMonitorSet("1920x1080,1280x1024@1920,0/0:144");
   ASSERT_EQ(M.size(), 2u);
   EXPECT_EQ(M[0].BoundsRect, Rect(0, 0, 1920, 1080));
   EXPECT_EQ(M[0].WorkareaRect, Rect(0, 0, 1920, 1040));
@@ -317,16 +317,16 @@ TEST_F(DesktopRenderTest, MonitorSetsAreReadWithTheirPlacesTaskBarsResolutionsAn
   EXPECT_EQ(M[1].WorkareaRect, Rect(1920, 0, 3200, 1024));
   EXPECT_EQ(M[1].PixelsPerInch, 144);
   EXPECT_FALSE(M[1].Primary);
-  M = ParseMonitorSpec("1024x768,800x600@-800,-100*");
+  M = ParseMonitorSet("1024x768,800x600@-800,-100*");
   EXPECT_FALSE(M[0].Primary);
   EXPECT_TRUE(M[1].Primary);
   EXPECT_EQ(M[1].BoundsRect, Rect(-800, -100, 0, 500));
 
-  auto Reason = [](const String& Spec) -> String {
+  auto Reason = [](const String& Monitors) -> String {
     try {
-      (void)ParseMonitorSpec(Spec);
+      (void)ParseMonitorSet(Monitors);
     } catch (const EDesktopUsageError& E) {
-      String Prefix = "Cannot read the monitor set \"" + Spec + "\": ";
+      String Prefix = "Cannot read the monitor set \"" + Monitors + "\": ";
       EXPECT_EQ(E.Message().rfind(Prefix, 0), 0u) << E.Message();
       return E.Message().substr(Prefix.size(), E.Message().find("; write") - Prefix.size());
     }
