@@ -85,6 +85,23 @@ struct ModuleFilesTest : KilnDesignFixture {
     Kiln->Modified();
   }
 
+  /// Saves Form2, a descendant of the open Form1 (the sample and a second button), with
+  /// its own caption "Mine" on Button1, closes it, and takes Button1 out of Form1: Form2's
+  /// file records changes to a component its ancestor no longer has.
+  void SaveDescendantThenLoseItsButton() {
+    IPtr<IRoot> Form1 = NewFormAt("Form1");
+    BuildSample(Form1);
+    KilnRoot(Form1)->CreateComponent(TButton::StaticClass(), Form1->GetRoot(), 100, 8, 75, 25);
+    Form1->Save();
+    IPtr<IRoot> Form2 = NewFormAt("Form2", "Form1");
+    static_cast<TButton*>(Form2->GetRoot()->FindComponent("Button1"))->SetCaption("Mine");
+    KilnRoot(Form2)->Modified();
+    Form2->Save();
+    Form2->Close();
+    Form1->GetRoot()->FindComponent("Button1")->Destroy();
+    KilnRoot(Form1)->Modified();
+  }
+
   static std::vector<std::uint8_t> FileBytes(const String& Path) {
     std::ifstream In(Path, std::ios::binary);
     return std::vector<std::uint8_t>(std::istreambuf_iterator<char>(In), {});

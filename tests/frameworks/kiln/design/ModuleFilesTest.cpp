@@ -219,18 +219,7 @@ TEST_F(ModuleFilesTest, ReadErrorsAskTheUserWhoMayIgnoreOnceIgnoreAllOrCancel) {
 }
 
 TEST_F(ModuleFilesTest, AnInheritedComponentTheAncestorLostIsRecoveredAsTheUserSays) {
-  IPtr<IRoot> Form1 = NewFormAt("Form1");
-  BuildSample(Form1);
-  KilnRoot(Form1)->CreateComponent(TButton::StaticClass(), Form1->GetRoot(), 100, 8, 75, 25);
-  Form1->Save();
-  IPtr<IRoot> Form2 = NewFormAt("Form2", "Form1");
-  static_cast<TButton*>(Form2->GetRoot()->FindComponent("Button1"))->SetCaption("Mine");
-  KilnRoot(Form2)->Modified();
-  Form2->Save();
-  Form2->Close();
-  // The ancestor loses Button1.
-  Form1->GetRoot()->FindComponent("Button1")->Destroy();
-  KilnRoot(Form1)->Modified();
+  SaveDescendantThenLoseItsButton();
 
   std::vector<String> Asked;
   auto Answer = [&](TRecoveryResult Result, const String& Rename) {

@@ -149,17 +149,7 @@ TEST_F(RecoveryDialogsTest, AReadErrorIsIgnoredIgnoredForTheRestOfTheReadOrCance
 }
 
 TEST_F(RecoveryDialogsTest, AnAncestorComponentLostOnTheWayIsRecoveredThroughTheDialog) {
-  IPtr<IRoot> Form1 = NewFormAt("Form1");
-  BuildSample(Form1);
-  KilnRoot(Form1)->CreateComponent(TButton::StaticClass(), Form1->GetRoot(), 100, 8, 75, 25);
-  Form1->Save();
-  IPtr<IRoot> Form2 = NewFormAt("Form2", "Form1");
-  static_cast<TButton*>(Form2->GetRoot()->FindComponent("Button1"))->SetCaption("Mine");
-  KilnRoot(Form2)->Modified();
-  Form2->Save();
-  Form2->Close();
-  Form1->GetRoot()->FindComponent("Button1")->Destroy();
-  KilnRoot(Form1)->Modified();
+  SaveDescendantThenLoseItsButton();
 
   AnswerOn<TRecoverFormInheritence>([](TRecoverFormInheritence& D) {
     EXPECT_EQ(D.MessageLbl->Caption(), "Modifications to component Button1 were recorded in form Form2 but the "
