@@ -1,5 +1,6 @@
 //===- platform/Objects.cpp - Class records, TObject and counted objects -===//
 #include "platform/TypInfo.h"
+#include "platform/Rtti.h"
 
 #include <algorithm>
 
@@ -126,6 +127,7 @@ TClass NewCompiledRecord(TClass Parent, const char* Name, const char* Unit, TObj
   auto* Rec = new TClassRec(Parent, Name, Unit); // immortal
   Rec->Compiled = Rec;
   Rec->Factory = Factory;
+  RememberType(Rec->TypeInfo(), Rec->QualifiedClassName());
   return Rec;
 }
 } // namespace detail

@@ -1,5 +1,6 @@
 //===- platform/TypInfo.cpp - Run-time type information and properties ---===//
 #include "platform/TypInfo.h"
+#include "platform/Rtti.h"
 
 #include <algorithm>
 #include <cctype>
@@ -38,6 +39,7 @@ PTypeInfo MakeOrdinalType(const char* Name, TTypeKind Kind, TOrdType Ord, std::i
   Info->Data.OrdType = Ord;
   Info->Data.MinValue = Min;
   Info->Data.MaxValue = Max;
+  RememberType(Info, Info->Name);
   return Info;
 }
 
@@ -45,6 +47,7 @@ PTypeInfo MakeSimpleType(const char* Name, TTypeKind Kind) {
   auto* Info = new TTypeInfo;
   Info->Kind = Kind;
   Info->Name = Name;
+  RememberType(Info, Info->Name);
   return Info;
 }
 
@@ -76,6 +79,7 @@ PTypeInfo MakeEnumType(const char* Name, TOrdType Ord, const char* Names, TTypeI
   Info->Data.MinValue = 0;
   Info->Data.MaxValue = static_cast<std::int64_t>(Info->Data.EnumNames.size()) - 1;
   Info->Data.BaseType = Self;
+  RememberType(Info, Info->Name);
   return Info;
 }
 
@@ -85,6 +89,7 @@ PTypeInfo MakeSetType(const char* Name, TTypeInfoFn Comp) {
   Info->Name = Name;
   Info->Data.CompType = Comp;
   Info->Data.OrdType = otULong;
+  RememberType(Info, Info->Name);
   return Info;
 }
 
@@ -94,6 +99,7 @@ PTypeInfo MakeInterfaceType(const char* Name, const TGUID& Guid, TTypeInfoFn Par
   Info->Name = Name;
   Info->Data.Guid = Guid;
   Info->Data.IntfParent = Parent;
+  RememberType(Info, Info->Name);
   return Info;
 }
 
@@ -183,6 +189,7 @@ PTypeInfo MakeMethodType(const char* Name, const char* Signature, const void* Si
     PutShortString(Out, FrameworkTypeName(Type));
   }
   PutShortString(Out, Result == "void" ? String() : FrameworkTypeName(Result));
+  RememberType(Info, Info->Name);
   return Info;
 }
 
