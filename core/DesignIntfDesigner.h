@@ -140,6 +140,9 @@ struct FK_API IDesigner60 : IDesignerNotify {
   /// then tells the host the tool was used, also when the creation failed. Null without
   /// an armed tool.
   virtual TComponent* CreateCurrentComponent(TComponent* Parent, const TRect& Rect) = 0;
+  /// As `CreateCurrentComponent`; `Scaled` says whether `Rect` is in the pixels per inch
+  /// of the designer (true) or already in the parent's. A surface creates through it.
+  virtual TComponent* CreateCurrentComponentScaled(TComponent* Parent, const TRect& Rect, bool Scaled) = 0;
   /// Where a new component would go now: the container of the one selected component, or
   /// the root.
   virtual TComponent* GetCurrentParent() = 0;

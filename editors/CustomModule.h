@@ -22,6 +22,26 @@
 
 namespace formkit {
 
+class TCustomForm;
+class TWinControl;
+
+/// What a custom module implements to give its root a design window of its own: the
+/// framework's designer asks it before it makes a window itself.
+struct FK_API ICustomDesignForm : IInterface {
+  FK_INTERFACE(ICustomDesignForm, IInterface, "{787195AF-C234-49DC-881B-221B69C0137A}")
+  /// Makes the window for `Root`: `DesignForm` shows the module, `ComponentContainer` is
+  /// where its components stand. The caller frees the window; both may come back null.
+  virtual void CreateDesignerForm(const IPtr<IDesigner>& Designer, TComponent* Root, TCustomForm*& DesignForm,
+                                  TWinControl*& ComponentContainer) = 0;
+};
+
+/// The later version, for a host that gives its own form (`IHostForm`).
+struct FK_API ICustomDesignForm80 : IInterface {
+  FK_INTERFACE(ICustomDesignForm80, IInterface, "{525A1DF8-5EF3-4B98-8EE3-4567910A7EA1}")
+  virtual void CreateDesignerForm(const IPtr<IDesigner>& Designer, TComponent* Root, IPtr<IHostForm>& DesignForm,
+                                  TWinControl*& ComponentContainer) = 0;
+};
+
 FK_RESOURCESTRING(sClassNotApplicable, "Class %s is not applicable to this module");
 
 /// The base of custom modules: no verbs, no attributes, not nestable, and every class

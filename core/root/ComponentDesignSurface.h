@@ -1,43 +1,15 @@
 //===- core/root/ComponentDesignSurface.h - What a root asks of its surface ===//
 //
-// The surface of a module on design, as its root drives it: refresh, options,
-// removal of items, and the initialising flag while the designer opens. A
-// framework's concrete surface implements it; `TComponentRoot` holds one.
+// What a root needs of the items its framework's surface makes, and the pixels
+// per inch of a parent item. The surface itself, as the root drives it
+// (`IComponentDesignSurface`), is declared with its base in surface/Surface.h.
 //
 //===----------------------------------------------------------------------===//
 #pragma once
 
-#include "core/ComponentDesignerIntf.h"
-#include "surface/Designer.h"
+#include "surface/Surface.h"
 
 namespace formkit {
-
-/// The options a root hands its surface.
-struct FK_API TDesignSurfaceOptions {
-  bool DisplayGrid = true;
-  bool ScaleGridSize = false;
-  TPoint GridSize{8, 8};
-  bool ShowComponentCaptions = false;
-  bool ShowDesignerHints = true;
-  bool ShowNonVisualComponents = true;
-  bool ShowExtendedControlHints = false;
-};
-
-/// The surface as the root sees it: the engine's `IDesignSurface` and what a root adds.
-struct FK_API IComponentDesignSurface : IDesignSurface {
-  FK_INTERFACE(IComponentDesignSurface, IDesignSurface, "{5A4C18CF-7A59-5A45-B0C8-3E7FA7C1C16A}")
-  /// Brings the surface up to date with the components.
-  virtual void UpdateSurface() = 0;
-  /// Drops cached items.
-  virtual void RefreshItems() = 0;
-  /// The module is about to report a change.
-  virtual void BeforeRootModified() = 0;
-  /// The component leaves the module.
-  virtual void ItemRemoved(TComponent* Component) = 0;
-  virtual void SetOptions(const TDesignSurfaceOptions& Options) = 0;
-  /// True while the designer opens: no notifications from the surface.
-  virtual void SetInitializing(bool Value) = 0;
-};
 
 /// What the root needs of the items it made itself.
 struct FK_API IInternalItem : IItem {

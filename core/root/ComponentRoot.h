@@ -130,14 +130,30 @@ private:
   IPtr<ISelections> FSelections;
 };
 
+/// The class group a module's components are taken from, as the module keeps it: known
+/// once a name was chosen. The root of a module answers it.
+struct FK_API IModuleClassGroup : IInterface {
+  FK_INTERFACE(IModuleClassGroup, IInterface, "{3F0E1C52-9B7D-4E0A-8C61-2D5A7B94E1F3}")
+  /// The qualified name of the group's class; empty while none was chosen.
+  virtual String GetClassGroupName() = 0;
+  /// The class of that name, or null when it is unknown or not a persistent class.
+  virtual TClass GetClassGroupClass() = 0;
+  /// Whether a group was chosen.
+  virtual bool ClassGroupKnown() = 0;
+  /// Chooses the group by qualified class name; empty forgets it.
+  virtual void SetClassGroupName(const String& Name) = 0;
+};
+
 /// One module on design. See the file comment.
 class FK_API TComponentRoot : public TInterfacedObject,
                               public IInternalRoot,
                               public IDesigner,
                               public IOTAAlignable,
-                              public IFlipChildren {
+                              public IFlipChildren,
+                              public ISurfaceHost,
+                              public IModuleClassGroup {
   FK_CLASS(TComponentRoot, TInterfacedObject)
-  FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren)
+  FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren, ISurfaceHost, IModuleClassGroup)
   // The tool facade (RootFormEditor.cpp) works on the module's streams and widget tree.
   friend class TOTAFormEditor;
   friend class TOTAComponent;
@@ -174,6 +190,15 @@ class FK_API TComponentRoot : public TInterfacedObject,
   /// Whether `Component` is a nested frame whose insides this module may change.
   bool ModifiableFrame(TComponent* Component) const { return IsModifiableFrame(Component); }
   IPtr<IRoot> AsRoot() { return IPtr<IRoot>(static_cast<IInternalRoot*>(this)); }
+  // The class group chosen for the module (RootClassGroup.cpp) ---------------------------
+  String GetClassGroupName() override { return FClassGroupName; }
+  TClass GetClassGroupClass() override;
+  bool ClassGroupKnown() override { return !FClassGroupName.empty(); }
+  /// Keeps the name; whoever changes it reports the change.
+  void SetClassGroupName(const String& Name) override;
+
+  /// The module as its surface sees it.
+  IPtr<ISurfaceHost> AsSurfaceHost() { return IPtr<ISurfaceHost>(static_cast<ISurfaceHost*>(this)); }
   /// The module's tool facade, made on first use and kept until the root goes
   /// (RootFormEditor.cpp).
   IPtr<IOTAFormEditor> GetFormEditor();
@@ -202,7 +227,7 @@ class FK_API TComponentRoot : public TInterfacedObject,
   bool CanModify();
   bool IsSourceReadOnly() override;
   /// Raises `EComponentDesignerException` "Source is read-only", or what the host raises.
-  void ValidateModification();
+  void ValidateModification() override;
   void Edit(TComponent* Component) override;
 
   // Selection and instances ---------------------------------------------------------------
@@ -223,9 +248,9 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void ClearSelection() override;
   void NoSelection() override;
   IPtr<IComponentEditor> GetComponentEditor();
-  void CanInsertComponent(TComponent* Component);
-  void InstanceInserted(TPersistent* Instance);
-  void InstanceRemoved(TPersistent* Instance);
+  void CanInsertComponent(TComponent* Component) override;
+  void InstanceInserted(TPersistent* Instance) override;
+  void InstanceRemoved(TPersistent* Instance) override;
   void EditComponent(TComponent* Component);
   int GetCompCount();
   TComponent* CompIndexToComponent(int Index);
@@ -242,7 +267,7 @@ class FK_API TComponentRoot : public TInterfacedObject,
                               int Height) override;
   void CreateComponentPos(const IPtr<IInternalPaletteItem>& PaletteItem, int X, int Y);
   TComponent* CreateCurrentComponent(TComponent* Parent, const TRect& Rect) override;
-  TComponent* CreateCurrentComponentScaled(TComponent* Parent, const TRect& Rect, bool Scaled);
+  TComponent* CreateCurrentComponentScaled(TComponent* Parent, const TRect& Rect, bool Scaled) override;
   TComponent* CreateChild(TClass ComponentClass, TComponent* Parent) override;
   /// Instantiates the module of a proxy class as a nested frame owned by `Owner`; null
   /// when the class is no proxy class or no module has it.
@@ -428,8 +453,8 @@ class FK_API TComponentRoot : public TInterfacedObject,
   /// Selects every component of the module that has an icon or a place on the surface.
   void SelectAll();
   /// The host shows one of its design dialogs.
-  void Dialog(TDesignDialog Kind);
-  void Command(TDesignCommand Kind);
+  void Dialog(TDesignDialog Kind) override;
+  void Command(TDesignCommand Kind) override;
   void FlipChildren(bool Value) override { FlipRootChildren(!Value); }
   /// Whether the revert command is offered: an inherited component is selected, the
   /// module has no descendants, and the root is not selected.
@@ -444,8 +469,8 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void DoUndelete();
   /// The components that can be selected: the module's, then those of its nested frames.
   void EnsureSelectableComponents();
-  int GetSelectableComponentCount();
-  TComponent* GetSelectableComponents(int Index);
+  int GetSelectableComponentCount() override;
+  TComponent* GetSelectableComponents(int Index) override;
   /// Puts a component stream on the clipboard, with its text.
   void CopyStreamToClipboard(TStream* Stream);
   /// A new stream of the components on the clipboard (component data or text); the
@@ -545,6 +570,8 @@ class FK_API TComponentRoot : public TInterfacedObject,
   void ChainCall(const String& MethodName, const String& InstanceName, const String& InstanceMethod,
                  const TTypeData* TypeData) override;
   void DeleteSelection(bool ADoAll) override;
+  /// The selection, without the root.
+  void DeleteSelection() override { DeleteSelection(false); }
   TComponent* GetComponent(const String& Name) override;
   String GetComponentName(TComponent* Component) override;
   void GetComponentNames(const TTypeData* TypeData, const TGetStrProc& Proc) override;
@@ -679,6 +706,7 @@ protected:
   TComponent* FRoot = nullptr;
   TClass FRootClass = nullptr;
   TClass FCustomModuleClass = nullptr;
+  String FClassGroupName; // qualified name of the module's class group; empty while unknown
   IPtr<TSelections> FSelections;
   IPtr<IInterfaceList> FMarkedItems;
   TMemoryStream* FRootStream = nullptr;

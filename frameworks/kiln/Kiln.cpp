@@ -18,7 +18,7 @@ std::vector<TClass> KilnClasses() {
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
           TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass(),
           TStatusBar::StaticClass(),   TToolBar::StaticClass(),    TSplitter::StaticClass(),
-          TDockTabSet::StaticClass()};
+          TDockTabSet::StaticClass(),  TScrollBox::StaticClass(),  TShape::StaticClass()};
 }
 } // namespace
 

@@ -168,7 +168,7 @@ class FK_API TControl : public TComponent, public TMessageTarget {
   /// Scales position and size (and a windowed control's children) from the control's own
   /// pixels per inch to `NewPPI`, which becomes its own. Raises `EInvalidOperation` for a
   /// value below 1.
-  void ScaleForPPI(int NewPPI);
+  virtual void ScaleForPPI(int NewPPI);
   /// `MulDiv(Value, CurrentPPI, 96)`.
   int ScaleValue(int Value) const { return MulDiv(Value, CurrentPPI(), DefaultPPI); }
 

@@ -14,6 +14,51 @@ FK_RESOURCESTRING(SInvalidTimeStep, "The clock cannot go back (%d milliseconds)"
 // TPanel
 //===----------------------------------------------------------------------===//
 
+FK_IMPLEMENT(TShape, "KilnExtCtrls") {
+  detail::PublishAlign(B);
+  B.Property("Brush", &TShape::Brush, &TShape::SetBrush);
+  B.Property("Pen", &TShape::Pen, &TShape::SetPen);
+  B.Property("Shape", &TShape::Shape, &TShape::SetShape).Default(stRectangle);
+  detail::PublishVisible(B);
+  B.Event("OnMouseDown", &TShape::OnMouseDown);
+  B.Event("OnMouseMove", &TShape::OnMouseMove);
+  B.Event("OnMouseUp", &TShape::OnMouseUp);
+}
+
+void TShape::Create(TComponent* AOwner) {
+  FBrush.Reset(new TBrush);
+  FPen.Reset(new TPen);
+  inherited::Create(AOwner);
+  SetBounds(0, 0, 65, 65);
+}
+
+void TShape::BeforeDestruction() {
+  inherited::BeforeDestruction();
+  FBrush.Reset();
+  FPen.Reset();
+}
+
+void TShape::Paint(TCanvas* Canvas) {
+  Canvas->Brush()->Assign(FBrush.Get());
+  Canvas->Pen()->Assign(FPen.Get());
+  TRect R = ClientRect();
+  bool Round = FShape == stEllipse || FShape == stCircle || FShape == stRoundRect || FShape == stRoundSquare;
+  if (Round) Canvas->Ellipse(R.Left, R.Top, R.Right, R.Bottom);
+  else Canvas->Rectangle(R);
+}
+
+void TShape::MouseDown(TMouseButton Button, TShiftState Shift, int X, int Y) {
+  if (OnMouseDown) OnMouseDown(this, Button, Shift, X, Y);
+}
+
+void TShape::MouseMove(TShiftState Shift, int X, int Y) {
+  if (OnMouseMove) OnMouseMove(this, Shift, X, Y);
+}
+
+void TShape::MouseUp(TMouseButton Button, TShiftState Shift, int X, int Y) {
+  if (OnMouseUp) OnMouseUp(this, Button, Shift, X, Y);
+}
+
 FK_IMPLEMENT(TPanel, "KilnExtCtrls") {
   detail::PublishAlign(B);
   B.Property("BevelInner", &TPanel::BevelInner, &TPanel::SetBevelInner).Default(bvNone);

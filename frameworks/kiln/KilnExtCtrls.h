@@ -26,6 +26,9 @@ namespace formkit {
 FK_API void AdvanceTimers(int Milliseconds);
 
 FK_ENUM(TBevelCut, std::uint8_t, bvNone, bvLowered, bvRaised, bvSpace)
+FK_ENUM(TShapeType, std::uint8_t, stRectangle, stSquare, stRoundRect, stRoundSquare, stEllipse, stCircle)
+FK_EVENT(TMouseEvent, void(TObject* Sender, TMouseButton Button, TShiftState Shift, int X, int Y));
+FK_EVENT(TMouseMoveEvent, void(TObject* Sender, TShiftState Shift, int X, int Y));
 
 /// A container: 185 by 41, accepts children, shows its caption in the middle.
 class FK_API TPanel : public TCustomControl {
@@ -52,6 +55,38 @@ private:
   TBevelCut FBevelInner = bvNone;
   int FBevelWidth = 1;
   int FBorderWidth = 0;
+};
+
+/// A filled figure: 65 by 65, a white rectangle with a black pen until set. It takes
+/// the mouse as the window delivers it (`MouseDown`, `MouseMove`, `MouseUp`), in its own
+/// client coordinates, and hands it to its events.
+class FK_API TShape : public TGraphicControl {
+  FK_CLASS(TShape, TGraphicControl)
+  void Create(TComponent* AOwner) override;
+  void BeforeDestruction() override;
+
+  /// The fill and the outline; owned.
+  TBrush* Brush() const noexcept { return FBrush.Get(); }
+  void SetBrush(TBrush* Value) { FBrush->Assign(Value); }
+  TPen* Pen() const noexcept { return FPen.Get(); }
+  void SetPen(TPen* Value) { FPen->Assign(Value); }
+  TShapeType Shape() const noexcept { return FShape; }
+  void SetShape(TShapeType Value) noexcept { FShape = Value; }
+  /// Fills and frames the figure: an ellipse for the round kinds, else a rectangle.
+  void Paint(TCanvas* Canvas) override;
+
+  // Input -----------------------------------------------------------------
+  void MouseDown(TMouseButton Button, TShiftState Shift, int X, int Y);
+  void MouseMove(TShiftState Shift, int X, int Y);
+  void MouseUp(TMouseButton Button, TShiftState Shift, int X, int Y);
+  TMouseEvent OnMouseDown;
+  TMouseMoveEvent OnMouseMove;
+  TMouseEvent OnMouseUp;
+
+private:
+  TObjectGuard<TBrush> FBrush;
+  TObjectGuard<TPen> FPen;
+  TShapeType FShape = stRectangle;
 };
 
 /// A non-visual component that calls `OnTimer` every `Interval` milliseconds of the

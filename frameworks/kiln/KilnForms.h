@@ -17,6 +17,7 @@
 #pragma once
 
 #include "frameworks/kiln/KilnControls.h"
+#include "frameworks/kiln/KilnScrollBox.h"
 #include "frameworks/kiln/KilnWindows.h"
 
 namespace formkit {
@@ -56,8 +57,8 @@ private:
 
 /// A top-level window. It starts hidden; its client area lies inside a frame and below
 /// a caption unless its border style is `bsNone`. It streams its client size.
-class FK_API TCustomForm : public TDesignableRoot<TWinControl> {
-  FK_CLASS(TCustomForm, TDesignableRoot<TWinControl>)
+class FK_API TCustomForm : public TDesignableRoot<TScrollingWinControl> {
+  FK_CLASS(TCustomForm, TDesignableRoot<TScrollingWinControl>)
 
   void Create(TComponent* AOwner) override;
   void BeforeDestruction() override;

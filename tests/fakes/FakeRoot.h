@@ -154,6 +154,7 @@ class TFakeRoot : public TInterfacedObject, public IInternalRoot, public IDesign
   TComponent* CreateComponent(TClass, TComponent*, int, int, int, int) override { return nullptr; }
   TComponent* CreateChild(TClass, TComponent*) override { return nullptr; }
   TComponent* CreateCurrentComponent(TComponent*, const TRect&) override { return nullptr; }
+  TComponent* CreateCurrentComponentScaled(TComponent*, const TRect&, bool) override { return nullptr; }
   TComponent* GetCurrentParent() override { return FRoot; }
   IPtr<IOTABasePaletteItem> GetPaletteItem(TClass) override { return nullptr; }
   void Revert(TPersistent*, PPropInfo) override {}

@@ -25,6 +25,8 @@
 #include "editors/ComponentGuidelines.h"
 #include "frameworks/kiln/KilnForms.h"
 #include "frameworks/kiln/KilnGraphics.h"
+#include "frameworks/kiln/design/DMForm.h"
+#include "frameworks/kiln/design/WCtlForm.h"
 #include "surface/DragBoxes.h"
 #include "surface/GestureEngine.h"
 
@@ -80,6 +82,12 @@ private:
 FK_RESOURCESTRING(sKilnControlOnDataModule, "Controls cannot be added to a data module (%s)");
 FK_RESOURCESTRING(sKilnNotAKilnClass, "Class %s does not belong to the Kiln framework");
 
+/// Whether a class may stand on a Kiln module: a component that is not a form.
+[[nodiscard]] FK_API bool KilnComponentClassApplies(TClass ComponentClass);
+/// Raises `EComponentDesignerException` `sKilnNotAKilnClass` for a component whose
+/// class `Module` refuses.
+FK_API void ValidateKilnComponent(ICustomModule& Module, TComponent* Component);
+
 /// What the framework adds to a module of forms: which classes may stand in it and
 /// whether its roots nest in other modules.
 class FK_API TKilnCustomModule : public TBaseCustomModule, public ICustomModule {
@@ -93,9 +101,9 @@ class FK_API TKilnCustomModule : public TBaseCustomModule, public ICustomModule 
   void PrepareItem(int, const IPtr<IMenuItem>&) override {}
   void Saving() override {}
   /// Raises `EComponentDesignerException` for a class that is not the framework's.
-  void ValidateComponent(TComponent* Component) override;
+  void ValidateComponent(TComponent* Component) override { ValidateKilnComponent(*this, Component); }
   /// Kiln controls and non-visual components.
-  bool ValidateComponentClass(TClass ComponentClass) override;
+  bool ValidateComponentClass(TClass ComponentClass) override { return KilnComponentClassApplies(ComponentClass); }
   /// Forms do not nest in other modules.
   bool Nestable() override { return false; }
 
@@ -103,15 +111,18 @@ protected:
   TComponent* FRoot = nullptr; // the module's root; the root holds this module
 };
 
-/// Frames nest in other modules.
-class FK_API TKilnFrameModule : public TKilnCustomModule {
-  FK_CLASS(TKilnFrameModule, TKilnCustomModule)
+/// Frames nest in other modules and are designed in a window around them.
+class FK_API TKilnFrameModule : public TWinControlCustomModule {
+  FK_CLASS(TKilnFrameModule, TWinControlCustomModule)
+  void ValidateComponent(TComponent* Component) override { ValidateKilnComponent(*this, Component); }
+  bool ValidateComponentClass(TClass ComponentClass) override { return KilnComponentClassApplies(ComponentClass); }
   bool Nestable() override { return true; }
 };
 
-/// A data module holds non-visual components only.
-class FK_API TKilnDataModuleModule : public TKilnCustomModule {
-  FK_CLASS(TKilnDataModuleModule, TKilnCustomModule)
+/// A data module holds non-visual components only, shown as icons in its window.
+class FK_API TKilnDataModuleModule : public TDataModuleCustomModule {
+  FK_CLASS(TKilnDataModuleModule, TDataModuleCustomModule)
+  /// Raises `sKilnControlOnDataModule` for a control, else as any Kiln module.
   void ValidateComponent(TComponent* Component) override;
   bool ValidateComponentClass(TClass ComponentClass) override;
 };
@@ -291,6 +302,8 @@ private:
   void LinkDesigner(TComponent* Instance, bool Link);
   TKilnSurface* FKilnSurface = nullptr; // owned through FSurface
   TCustomForm* FWindow = nullptr;       // the form itself, or one the root made
+  TWinControl* FContainer = nullptr;    // where the components stand: in FWindow, or it
+  TComponent* FWindowRoot = nullptr;    // the root the window was made for
   bool FOwnWindow = false;
 };
 
@@ -417,15 +430,22 @@ private:
 };
 
 /// The surface of one Kiln module. Its design coordinates are the client area of the
-/// root's window; global coordinates are the same. Input arrives through `MouseDown`,
-/// `MouseMove`, `MouseUp` and `KeyDown`, as the window would deliver it. The surface
-/// draws the guide lines of a drag on its canvas itself.
-class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSurface, public IGuidelinePainter {
-  FK_CLASS(TKilnSurface, TInterfacedObject)
-  FK_INTERFACES(IComponentDesignSurface, IGuidelinePainter)
+/// container the components stand in (the form itself, a frame, or a data module's
+/// scrolled area, whose scroll offset input is moved by); global coordinates are the
+/// same. Input arrives through `MouseDown`, `MouseMove`, `MouseUp` and `KeyDown`, as
+/// the window would deliver it. The surface draws the guide lines of a drag on its
+/// canvas itself.
+class FK_API TKilnSurface : public TDesignSurface, public IGuidelinePainter {
+  FK_CLASS(TKilnSurface, TDesignSurface)
   TKilnSurface() : FCanvas(new TCanvas) {}
   TKilnSurface(TKilnRoot* Root, TWinControl* Container);
   void BeforeDestruction() override;
+
+  // Identity: the base's, which answers `IDesigner` with the designer's interface.
+  bool QueryInterface(const TGUID& IID, void** Obj) override { return inherited::QueryInterface(IID, Obj); }
+  int AddRef() override { return ObjAddRef(); }
+  int Release() override { return ObjRelease(); }
+  void* GetInterfaceEntry(const TGUID& IID) override;
 
   // Input, as the design window delivers it --------------------------------------------
   void MouseDown(int X, int Y, TShiftState Shift, bool DoubleClick = false);
@@ -435,47 +455,40 @@ class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSur
 
   /// Where feedback is drawn: drag boxes, handles, icons.
   TCanvas* Canvas() noexcept { return FCanvas.Get(); }
-  TKilnRoot* Root() const noexcept { return FRoot; }
+  TKilnRoot* Root() const noexcept { return FKilnRoot; }
   TWinControl* Container() const noexcept { return FContainer; }
   /// The item of a component of the module.
   IPtr<IItem> ItemOf(TComponent* Component);
+  /// How far a data module's area is scrolled: what input coordinates are moved by to
+  /// reach the icons' positions. (0, 0) for a form or a frame, whose controls scroll.
+  TPoint ScrollOffset() const;
+  /// A point of the container's client area in design coordinates.
+  TPoint InputPoint(int X, int Y) const;
 
-  // IDesignSurface ------------------------------------------------------------------------
-  void AddListener(const IPtr<IDesignSurfaceListener>& Listener) override { FListener = Listener; }
+  // IDesignSurface: what touches the window ------------------------------------------------
   IPtr<IDragBoxes> BeginDrag(const IPtr<IItem>& Parent, const TPoint& Point) override;
+  /// Drops the listener and the handles; the root is gone for the surface.
   void Close() override;
-  IPtr<IItem> CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) override;
   TPoint GetCursorPoint() override { return FCursor; }
-  void DeleteSelection() override;
   TPoint DesignToGlobal(const TPoint& Point) override { return Point; }
-  void DestroyItem(const IPtr<IItem>& Item) override;
+  /// The next (or previous) of the selectable components, around the end.
   IPtr<IItem> FindNextItem(const IPtr<IItem>& Item, bool Forward) override;
   void FocusSurface() override { FFocused = true; }
-  IPtr<IGrabHandles> GetGrabHandles() override { return FHandles; }
   /// The surface paints the guide lines itself.
   IPtr<IGuidelinePainter> GetGuidelinePainter() override { return IPtr<IGuidelinePainter>(this); }
-  IPtr<IItem> GetItems(int Index) override;
-  int GetItemsCount() override;
   TPoint GetOrigin() override { return {0, 0}; }
+  /// The container's item; made on request.
   IPtr<IItem> GetRoot() override;
   IPtr<IItem> GetContainerItem() override { return GetRoot(); }
   TPoint GlobalToDesign(const TPoint& Point) override { return Point; }
-  bool GridSnapDisabled() override { return false; }
   IPtr<IItem> ItemAtPoint(int X, int Y) override;
-  void RemoveListener(const IPtr<IDesignSurfaceListener>& Listener) override;
   void ShowContextMenu() override {}
-  void ValidateModification() override;
-  void Modified() override;
-  bool ItemInSelections(const IPtr<ISelections>& Selections, const IPtr<IItem>& Item) override;
   IPtr<IItem> ItemFromComponent(TComponent* Component) override { return ItemOf(Component); }
 
   // IComponentDesignSurface --------------------------------------------------------------
   void UpdateSurface() override;
-  void RefreshItems() override {}
-  void BeforeRootModified() override {}
   void ItemRemoved(TComponent* Component) override;
-  void SetOptions(const TDesignSurfaceOptions& Options) override { FOptions = Options; }
-  void SetInitializing(bool Value) override { FInitializing = Value; }
+  void SetOptions(const TDesignSurfaceOptions& Options) override;
 
   // IGuidelinePainter: each line a "MoveTo" and a "LineTo" on the canvas -----------------
   void AddGuide(const TRect& Rect, TGuideType GuideType) override;
@@ -495,16 +508,14 @@ class FK_API TKilnSurface : public TInterfacedObject, public IComponentDesignSur
   const std::vector<TGuideLine>& GuideLines() const noexcept { return FGuideLines; }
 
 private:
-  TKilnRoot* FRoot = nullptr;       // the root holds this surface
-  TWinControl* FContainer = nullptr; // the root's window (a form, or the window of a frame)
-  IPtr<IDesignSurfaceListener> FListener;
-  IPtr<TKilnGrabHandles> FHandles;
+  TKilnRoot* FKilnRoot = nullptr;       // the root holds this surface
+  TWinControl* FContainer = nullptr; // where the module's components stand
+  IPtr<TKilnGrabHandles> FHandles;   // also the base's grab handles
   TObjectGuard<TCanvas> FCanvas;
   std::vector<TGuideLine> FGuideLines;
   TDesignSurfaceOptions FOptions;
   TPoint FCursor;
   bool FFocused = false;
-  bool FInitializing = false;
 };
 
 } // namespace formkit

@@ -20,28 +20,29 @@ FK_IMPLEMENT(TKilnCustomModule, "KilnDesign") {}
 FK_IMPLEMENT(TKilnFrameModule, "KilnDesign") {}
 FK_IMPLEMENT(TKilnDataModuleModule, "KilnDesign") {}
 
+bool KilnComponentClassApplies(TClass ComponentClass) {
+  return ComponentClass && ComponentClass->InheritsFrom(TComponent::StaticClass()) &&
+         !ComponentClass->InheritsFrom(TCustomForm::StaticClass());
+}
+
+void ValidateKilnComponent(ICustomModule& Module, TComponent* Component) {
+  if (!Module.ValidateComponentClass(Component->ClassType()))
+    throw EComponentDesignerException(sKilnNotAKilnClass, Component->ClassName());
+}
+
 void TKilnCustomModule::Create(TComponent* ARoot, const IPtr<IDesigner>& ADesigner) {
   inherited::Create(ARoot, ADesigner);
   FRoot = ARoot;
 }
 
-void TKilnCustomModule::ValidateComponent(TComponent* Component) {
-  if (!ValidateComponentClass(Component->ClassType()))
-    throw EComponentDesignerException(sKilnNotAKilnClass, Component->ClassName());
-}
-
-bool TKilnCustomModule::ValidateComponentClass(TClass ComponentClass) {
-  return ComponentClass->InheritsFrom(TComponent::StaticClass()) &&
-         !ComponentClass->InheritsFrom(TCustomForm::StaticClass());
-}
-
 void TKilnDataModuleModule::ValidateComponent(TComponent* Component) {
   if (dynamic_cast<TControl*>(Component)) throw EComponentDesignerException(sKilnControlOnDataModule, Component->ClassName());
-  inherited::ValidateComponent(Component);
+  ValidateKilnComponent(*this, Component);
 }
 
 bool TKilnDataModuleModule::ValidateComponentClass(TClass ComponentClass) {
-  return inherited::ValidateComponentClass(ComponentClass) && !ComponentClass->InheritsFrom(TControl::StaticClass());
+  return KilnComponentClassApplies(ComponentClass) && !ComponentClass->InheritsFrom(TControl::StaticClass()) &&
+         !IsInvalidDataModuleClass(ComponentClass);
 }
 
 IPtr<IRoot> TKilnDesigner::CreateRoot(const IPtr<IDesignerModule>& Module, const String& FileName, bool AExisting,
@@ -133,6 +134,7 @@ void RegisterKilnDesignPackage() {
   RegisterComponentGuidelines(TControl::StaticClass(), TControlGuidelines::StaticClass());
   RegisterComponentGuidelines(TWinControl::StaticClass(), TWinControlGuidelines::StaticClass());
   RegisterComponentGuidelines(TCustomForm::StaticClass(), TCustomFormGuidelines::StaticClass());
+  RegisterSelectionEditor(TDataModule::StaticClass(), TDataModuleSelectionEditor::StaticClass());
   RegisterKilnSprigs();
   // Creation on a surface scales by the pixels per inch of the parent control.
   GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {

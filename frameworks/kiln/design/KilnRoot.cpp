@@ -36,6 +36,9 @@ void TKilnRoot::InitNewRoot(TComponent* Instance, const String&) {
   if (auto* Form = dynamic_cast<TCustomForm*>(Instance)) {
     Form->SetClientWidth(NewFormWidth);
     Form->SetClientHeight(NewFormHeight);
+  } else if (auto* Module = dynamic_cast<TDataModule*>(Instance)) {
+    // A new data module's window opens at the size of the stored one.
+    Module->SetDesignSize(TDataModuleForm::StoredSize());
   }
 }
 
@@ -46,20 +49,37 @@ void TKilnRoot::NewRootCreated(TComponent* Instance, const String&) {
 
 void TKilnRoot::RootInstanceReady() {
   // The window that shows the module: a form shows itself; a frame or a data module is
-  // shown in a window of its own.
+  // shown in the window its custom module makes, or else in a plain one.
+  FWindowRoot = FRoot;
   if (auto* Form = dynamic_cast<TCustomForm*>(FRoot)) {
     FWindow = Form;
     FOwnWindow = false;
+    FContainer = Form;
     return;
+  }
+  if (auto WindowMaker = QueryAs<ICustomDesignForm>(GetCustomModule())) {
+    TCustomForm* Window = nullptr;
+    TWinControl* Container = nullptr;
+    WindowMaker->CreateDesignerForm(AsDesigner(), FRoot, Window, Container);
+    if (Window) {
+      FWindow = Window;
+      FOwnWindow = true;
+      FContainer = Container ? Container : Window;
+      return;
+    }
   }
   FWindow = CreateComponentOf<TForm>(nullptr);
   FOwnWindow = true;
-  if (auto* Frame = dynamic_cast<TCustomFrame*>(FRoot)) Frame->SetParent(FWindow);
+  FContainer = FWindow;
+  if (auto* Frame = dynamic_cast<TCustomFrame*>(FRoot)) {
+    Frame->SetParent(FWindow);
+    FContainer = Frame;
+  }
 }
 
 void TKilnRoot::InitializeSurface() {
-  auto* Container = dynamic_cast<TWinControl*>(FRoot);
-  IPtr<TKilnSurface> Surface = New<TKilnSurface>(this, Container ? Container : FWindow);
+  IPtr<TKilnSurface> Surface = New<TKilnSurface>(this, FContainer ? FContainer : FWindow);
+  Surface->Create(AsDesigner(), FRoot, AsSurfaceHost());
   FKilnSurface = Surface.Get();
   FSurface = InterfaceOf<IComponentDesignSurface>(Surface.Get());
   IPtr<TDesigner> Engine =
@@ -71,11 +91,16 @@ void TKilnRoot::TearDownRoot() {
   FKilnSurface = nullptr;
   if (FRoot) LinkDesigner(FRoot, false);
   if (FOwnWindow && FWindow) {
-    // The module's frame is not the window's to free.
-    if (auto* Frame = dynamic_cast<TCustomFrame*>(FRoot)) Frame->SetParent(nullptr);
+    // Neither the module's root nor its frame is the window's to free.
+    if (TComponent* Root = FWindowRoot) {
+      if (Root->Owner() == FWindow) FWindow->RemoveComponent(Root);
+      if (auto* Control = dynamic_cast<TControl*>(Root); Control && Control->Parent()) Control->SetParent(nullptr);
+    }
     FreeAndNil(FWindow);
   }
   FWindow = nullptr;
+  FContainer = nullptr;
+  FWindowRoot = nullptr;
   FOwnWindow = false;
 }
 
@@ -96,8 +121,9 @@ void TKilnRoot::ShowRootWindowAs(TShowState State) {
 }
 
 TComponent* TKilnRoot::RootOf(TComponent* Component) {
+  // The module's root may stand in its design window's components: it is still the top.
   TComponent* Top = Component;
-  while (Top && Top->Owner()) Top = Top->Owner();
+  while (Top && Top != FRoot && Top->Owner()) Top = Top->Owner();
   return Top;
 }
 

@@ -76,7 +76,9 @@ void TKilnGrabHandles::RefreshHandles() {
 //===----------------------------------------------------------------------===//
 
 TKilnSurface::TKilnSurface(TKilnRoot* Root, TWinControl* Container)
-    : FRoot(Root), FContainer(Container), FHandles(New<TKilnGrabHandles>(this)), FCanvas(new TCanvas) {}
+    : FKilnRoot(Root), FContainer(Container), FHandles(New<TKilnGrabHandles>(this)), FCanvas(new TCanvas) {
+  FGrabHandles = FHandles;
+}
 
 void TKilnSurface::BeforeDestruction() {
   FHandles = nullptr;
@@ -84,29 +86,35 @@ void TKilnSurface::BeforeDestruction() {
   inherited::BeforeDestruction();
 }
 
+void* TKilnSurface::GetInterfaceEntry(const TGUID& IID) {
+  if (void* P = detail::FindInterface<TKilnSurface, IGuidelinePainter>(this, IID)) return P;
+  return inherited::GetInterfaceEntry(IID);
+}
+
 IPtr<IItem> TKilnSurface::ItemOf(TComponent* Component) {
-  if (!Component || !FRoot) return nullptr;
-  IPtr<IDesigner> Designer = FRoot->AsDesigner();
+  if (!Component || !FKilnRoot) return nullptr;
+  IPtr<IDesigner> Designer = FKilnRoot->AsDesigner();
   if (auto* Control = dynamic_cast<TControl*>(Component))
     return NewAs<IItem, TKilnControlItem>(Control, this, Designer);
-  if (Component->Owner() == FRoot->Root()) return NewAs<IItem, TKilnIconItem>(Component, this, Designer);
+  if (Component->Owner() == FKilnRoot->Root()) return NewAs<IItem, TKilnIconItem>(Component, this, Designer);
   return NewAs<IItem, TNonControlItem>(Component, Designer);
+}
+
+TPoint TKilnSurface::InputPoint(int X, int Y) const {
+  TPoint Offset = ScrollOffset();
+  return {X + Offset.X, Y + Offset.Y};
+}
+
+TPoint TKilnSurface::ScrollOffset() const {
+  auto* Area = dynamic_cast<TScrollingWinControl*>(FContainer);
+  if (!Area || dynamic_cast<TCustomForm*>(FContainer)) return {0, 0};
+  return {Area->HorzScrollBar()->Position(), Area->VertScrollBar()->Position()};
 }
 
 IPtr<IItem> TKilnSurface::GetRoot() { return ItemOf(FContainer); }
 
-IPtr<IItem> TKilnSurface::GetItems(int Index) {
-  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
-  return Root ? ItemOf(Root->Components(Index)) : nullptr;
-}
-
-int TKilnSurface::GetItemsCount() {
-  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
-  return Root ? Root->ComponentCount() : 0;
-}
-
 IPtr<IItem> TKilnSurface::ItemAtPoint(int X, int Y) {
-  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  TComponent* Root = FKilnRoot ? FKilnRoot->Root() : nullptr;
   // Icons lie above the controls; the last one above the others.
   if (Root)
     for (int I = Root->ComponentCount() - 1; I >= 0; --I) {
@@ -134,17 +142,6 @@ IPtr<IDragBoxes> TKilnSurface::BeginDrag(const IPtr<IItem>&, const TPoint&) {
   return NewAs<IDragBoxes, TKilnDragBoxes>(FCanvas.Get(), GetGuidelinePainter());
 }
 
-IPtr<IItem> TKilnSurface::CreateItem(const IPtr<IItem>& Parent, const TRect& Rect, bool Scaled) {
-  TComponent* Component = FRoot->CreateCurrentComponentScaled(ExtractComponent(Parent), Rect, Scaled);
-  return ItemOf(Component);
-}
-
-void TKilnSurface::DeleteSelection() { FRoot->DeleteSelection(false); }
-
-void TKilnSurface::DestroyItem(const IPtr<IItem>& Item) {
-  if (TComponent* C = ExtractComponent(Item)) C->Destroy();
-}
-
 IPtr<IItem> TKilnSurface::FindNextItem(const IPtr<IItem>& Item, bool Forward) {
   int Count = GetItemsCount();
   if (Count == 0) return nullptr;
@@ -155,30 +152,21 @@ IPtr<IItem> TKilnSurface::FindNextItem(const IPtr<IItem>& Item, bool Forward) {
   return GetItems(Next);
 }
 
-void TKilnSurface::RemoveListener(const IPtr<IDesignSurfaceListener>& Listener) {
-  if (FListener == Listener) FListener = nullptr;
-}
-
 void TKilnSurface::Close() {
   if (FHandles) FHandles->AttachHandles(nullptr);
+  inherited::Close();
   FListener = nullptr;
-  FRoot = nullptr;
+  FKilnRoot = nullptr;
 }
 
-void TKilnSurface::ValidateModification() { FRoot->ValidateModification(); }
-
-void TKilnSurface::Modified() { FRoot->Modified(); }
-
-bool TKilnSurface::ItemInSelections(const IPtr<ISelections>& Selections, const IPtr<IItem>& Item) {
-  IPtr<IItem> Container = GetContainerItem();
-  for (IPtr<IItem> Current = Item; Current && !SameItem(Current, Container); Current = Current->GetParent())
-    if (Selections->Selected(Current)) return true;
-  return false;
+void TKilnSurface::SetOptions(const TDesignSurfaceOptions& Options) {
+  inherited::SetOptions(Options);
+  FOptions = Options;
 }
 
 void TKilnSurface::UpdateSurface() {
   // Icons of the non-visual components, with their names.
-  TComponent* Root = FRoot ? FRoot->Root() : nullptr;
+  TComponent* Root = FKilnRoot ? FKilnRoot->Root() : nullptr;
   if (!Root || !FOptions.ShowNonVisualComponents) return;
   for (int I = 0; I < Root->ComponentCount(); ++I) {
     TComponent* C = Root->Components(I);
@@ -198,21 +186,21 @@ void TKilnSurface::ItemRemoved(TComponent* Component) {
 //===----------------------------------------------------------------------===//
 
 void TKilnSurface::MouseDown(int X, int Y, TShiftState Shift, bool DoubleClick) {
-  FCursor = {X, Y};
+  FCursor = InputPoint(X, Y);
   if (!FListener) return;
-  TMoveAffects Affects = FHandles->HandleAtPoint(X, Y);
-  IPtr<IItem> Item = Affects.Empty() ? ItemAtPoint(X, Y) : FHandles->GetAttachedItem();
-  FListener->MouseDown(Item, Shift, X, Y, DoubleClick, Affects, false);
+  TMoveAffects Affects = FHandles->HandleAtPoint(FCursor.X, FCursor.Y);
+  IPtr<IItem> Item = Affects.Empty() ? ItemAtPoint(FCursor.X, FCursor.Y) : FHandles->GetAttachedItem();
+  FListener->MouseDown(Item, Shift, FCursor.X, FCursor.Y, DoubleClick, Affects, false);
 }
 
 void TKilnSurface::MouseMove(int X, int Y) {
-  FCursor = {X, Y};
-  if (FListener) FListener->MouseMove(X, Y);
+  FCursor = InputPoint(X, Y);
+  if (FListener) FListener->MouseMove(FCursor.X, FCursor.Y);
 }
 
 void TKilnSurface::MouseUp(int X, int Y) {
-  FCursor = {X, Y};
-  if (FListener) FListener->MouseUp(X, Y);
+  FCursor = InputPoint(X, Y);
+  if (FListener) FListener->MouseUp(FCursor.X, FCursor.Y);
 }
 
 void TKilnSurface::KeyDown(TDesignKeyCode Key, TShiftState Shift, char Ch) {
