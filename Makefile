@@ -1,5 +1,5 @@
 # The commands a person types. Each installs what a fresh machine lacks first.
-.PHONY: demo test fuzz bench test-build release deps clean
+.PHONY: demo test fuzz bench test-build release threads deps clean
 
 deps:
 	@bash scripts/install-deps
@@ -21,10 +21,20 @@ release: deps
 	cmake --preset release
 	cmake --build --preset release
 
+# The process runner's threads under ThreadSanitizer, in a build of their own: the address
+# sanitizer of the test build cannot run beside it.
+threads: deps
+	cmake --preset threads
+	cmake --build --preset threads
+	TSAN_OPTIONS=halt_on_error=1 build/threads/tests/tools/fk_test_tools --gtest_brief=1 \
+	  --gtest_filter='*Process*:*Thread*'
+
 # Both compilers, because each finds faults the other misses: the sanitizer build's tests and
-# bounded fuzz runs first, then the g++ build's tests, whose CTest summary ends the output.
+# bounded fuzz runs first, the runner's threads, then the g++ build's tests, whose CTest
+# summary ends the output.
 test: test-build
 	ctest --preset test
+	$(MAKE) --no-print-directory threads
 	cmake --preset release
 	cmake --build --preset release
 	bash scripts/check-consumer

@@ -4,12 +4,8 @@
 // the shell here is just a program that prints what it was given. Each process
 // test checks at its end that no descriptor and no child was left behind.
 //
-// The runner's threads under ThreadSanitizer, in a build directory of its own (one
-// configure command, without the address sanitizer of the test preset):
-//   cmake -S . -B build/tsan -G Ninja -DCMAKE_CXX_COMPILER=clang++ -DFK_TESTS=ON
-//         -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS="-fsanitize=thread -O1 -g"
-//   cmake --build build/tsan --target fk_test_tools -j1
-//   build/tsan/tests/tools/fk_test_tools --gtest_filter='*Process*:*Thread*'
+// The test command also runs the runner's threads under ThreadSanitizer, in a build
+// directory of its own without the address sanitizer (`make threads`, preset "threads").
 //
 //===----------------------------------------------------------------------===//
 #include "tools/ProcessUtil.h"
