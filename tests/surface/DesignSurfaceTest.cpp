@@ -1,4 +1,5 @@
 //===- tests/surface/DesignSurfaceTest.cpp - What the base surface keeps and forwards ===//
+#include "surface/DragBoxes.h"
 #include "surface/Surface.h"
 #include "tests/fakes/CallLog.h"
 #include "tests/fakes/FakeRoot.h"
