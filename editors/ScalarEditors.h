@@ -122,7 +122,7 @@ class FK_API TSetElementProperty : public TNestedProperty {
   /// With a declared default, whether the bit is as in the default.
   bool GetIsDefault() override;
 
-private:
+protected:
   int FElement = 0;
   /// `FElement` minus the minimum of the element type: the bit in the stored set.
   int FBit = 0;

@@ -27,10 +27,11 @@ FK_ENUM(TMsgDlgBtn, std::uint8_t, mbYes, mbNo, mbOK, mbCancel, mbAbort, mbRetry,
         mbNoToAll, mbYesToAll, mbHelp, mbClose)
 FK_SET(TMsgDlgButtons, TMsgDlgBtn)
 
-/// What a modal form answers.
+/// What a modal form answers; the values are those the form files and the inspector use.
 using TModalResult = int;
 inline constexpr TModalResult mrNone = 0, mrOk = 1, mrCancel = 2, mrAbort = 3, mrRetry = 4, mrIgnore = 5,
-                              mrYes = 6, mrNo = 7, mrAll = 8, mrNoToAll = 9, mrYesToAll = 10, mrClose = 11;
+                              mrYes = 6, mrNo = 7, mrClose = 8, mrHelp = 9, mrTryAgain = 10, mrContinue = 11,
+                              mrAll = 12, mrNoToAll = 13, mrYesToAll = 14;
 
 /// The answer a button gives, and its name and caption on a message dialog ("OK", "&OK").
 FK_API TModalResult ModalResultOfButton(TMsgDlgBtn Button) noexcept;

@@ -46,7 +46,7 @@ TEST_F(FormkitCommandTest, TreePrintsTheStructureTreeWithCollectionsAndNestedFra
 
 TEST_F(FormkitCommandTest, PropsShowsTheInspectorsListAndSetWritesThroughTheEditor) {
   ASSERT_EQ(Run({"props", At("Form1.kfm"), "Button1"}), feOK) << Err.str();
-  EXPECT_NE(Out.str().find("Caption\tOK\tpaMultiSelect,paRevertable\n"), String::npos) << Out.str();
+  EXPECT_NE(Out.str().find("Caption\tOK\tpaMultiSelect,paAutoUpdate,paRevertable\n"), String::npos) << Out.str();
   EXPECT_NE(Out.str().find("Left\t296\tpaMultiSelect,paRevertable\n"), String::npos) << Out.str();
   EXPECT_NE(Out.str().find("OnClick\t\tpaValueList,paMultiSelect,paSortList,paRevertable\n"), String::npos) << Out.str();
 
