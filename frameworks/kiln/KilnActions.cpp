@@ -5,7 +5,6 @@
 
 namespace formkit {
 
-FK_RESOURCESTRING(SActionIndexError, "Action index out of bounds (%d)");
 FK_RESOURCESTRING(SMenuIndexError, "Menu index out of bounds (%d)");
 FK_RESOURCESTRING(SMenuItemLoop, "A menu item cannot hold itself or an item above it");
 
@@ -13,58 +12,17 @@ FK_RESOURCESTRING(SMenuItemLoop, "A menu item cannot hold itself or an item abov
 // Actions
 //===----------------------------------------------------------------------===//
 
-FK_IMPLEMENT(TAction, "KilnActions") {
-  B.Property("Caption", &TAction::Caption, &TAction::SetCaption);
-  B.Property("Checked", &TAction::Checked, &TAction::SetChecked).Default(false);
-  B.Property("Enabled", &TAction::Enabled, &TAction::SetEnabled).Default(true);
-  B.Property("Hint", &TAction::Hint, &TAction::SetHint);
-  B.Event("OnExecute", &TAction::OnExecute);
-  B.Event("OnUpdate", &TAction::OnUpdate);
+FK_IMPLEMENT(TAction, "KilnActions") {}
+
+TActionList* TAction::ActionList() const noexcept {
+  return dynamic_cast<TActionList*>(TContainedAction::ActionList());
 }
 
-void TAction::BeforeDestruction() {
-  SetActionList(nullptr);
-  inherited::BeforeDestruction();
-}
-
-void TAction::SetActionList(TActionList* Value) {
-  if (Value == FActionList) return;
-  if (Value) Value->FActions.reserve(Value->FActions.size() + 1);
-  if (FActionList) std::erase(FActionList->FActions, this);
-  FActionList = Value;
-  if (Value) Value->FActions.push_back(this);
-}
-
-bool TAction::Execute() {
-  if (!FEnabled || !OnExecute) return false;
-  OnExecute(this);
-  return true;
-}
-
-bool TAction::Update() {
-  if (!OnUpdate) return false;
-  OnUpdate(this);
-  return true;
-}
+void TAction::SetActionList(TActionList* Value) { TContainedAction::SetActionList(Value); }
 
 FK_IMPLEMENT(TActionList, "KilnActions") {}
 
-void TActionList::BeforeDestruction() {
-  for (TAction* A : FActions) A->FActionList = nullptr;
-  FActions.clear();
-  inherited::BeforeDestruction();
-}
-
-TAction* TActionList::Actions(int Index) const {
-  if (Index < 0 || Index >= ActionCount()) throw EListError(SActionIndexError, Index);
-  return FActions[static_cast<std::size_t>(Index)];
-}
-
-void TActionList::UpdateActions() {
-  // A copy: an update may add or remove actions.
-  std::vector<TAction*> Now = FActions;
-  for (TAction* A : Now) A->Update();
-}
+TAction* TActionList::Actions(int Index) const { return dynamic_cast<TAction*>(TContainedActionList::Actions(Index)); }
 
 //===----------------------------------------------------------------------===//
 // Menus
@@ -72,6 +30,11 @@ void TActionList::UpdateActions() {
 
 FK_IMPLEMENT(TMenuItem, "KilnMenus") {
   B.Property("Checked", &TMenuItem::Checked, &TMenuItem::SetChecked).Default(false);
+  B.Property("GroupIndex", &TMenuItem::GroupIndex, &TMenuItem::SetGroupIndex).Default(0);
+  B.Property("ImageIndex", &TMenuItem::ImageIndex, &TMenuItem::SetImageIndex).Default(-1);
+  B.Property("RadioItem", &TMenuItem::RadioItem, &TMenuItem::SetRadioItem).Default(false);
+  B.Property("ShortCut", &TMenuItem::ShortCut, &TMenuItem::SetShortCut).Default(0);
+  B.Property("Visible", &TMenuItem::Visible, &TMenuItem::SetVisible).Default(true);
   B.Event("OnClick", &TMenuItem::OnClick);
 }
 
@@ -95,13 +58,27 @@ TMenuItem* TMenuItem::Items(int Index) const {
   return FItems[static_cast<std::size_t>(Index)];
 }
 
-void TMenuItem::Add(TMenuItem* Item) {
+void TMenuItem::Add(TMenuItem* Item) { Insert(Count(), Item); }
+
+void TMenuItem::Insert(int Index, TMenuItem* Item) {
   for (const TMenuItem* Up = this; Up; Up = Up->FParent)
     if (Up == Item) throw EInvalidOperation(SMenuItemLoop);
   FItems.reserve(FItems.size() + 1);
   if (Item->FParent) std::erase(Item->FParent->FItems, Item);
   Item->FParent = this;
-  FItems.push_back(Item);
+  Index = std::clamp(Index, 0, Count());
+  FItems.insert(FItems.begin() + Index, Item);
+}
+
+void TMenuItem::Delete(int Index) {
+  TMenuItem* Item = Items(Index);
+  FItems.erase(FItems.begin() + Index);
+  Item->FParent = nullptr;
+}
+
+int TMenuItem::IndexOf(const TMenuItem* Item) const noexcept {
+  auto Found = std::find(FItems.begin(), FItems.end(), Item);
+  return Found == FItems.end() ? -1 : static_cast<int>(Found - FItems.begin());
 }
 
 void TMenuItem::Click() {

@@ -3,7 +3,8 @@
 // An action is a command with its caption, check mark and enabled state in
 // one place: menu items linked to it show what it says and run it when
 // clicked. `OnUpdate` lets the owner set the state just before it is shown;
-// `TActionList::UpdateActions` asks every action of the list. A popup menu is
+// `TActionList::UpdateActions` asks every action of the list. Kiln's action
+// and list are the framework's forms of the contained action and list. A popup menu is
 // a tree of menu items under its `Items`.
 //
 // Example:
@@ -19,6 +20,7 @@
 #pragma once
 
 #include "frameworks/kiln/KilnControls.h"
+#include "platform/Actions.h"
 
 namespace formkit {
 
@@ -28,58 +30,23 @@ class TActionList;
 // Actions
 //===----------------------------------------------------------------------===//
 
-/// A command that menu items and buttons share.
-class FK_API TAction : public TComponent {
-  FK_CLASS(TAction, TComponent)
-  void BeforeDestruction() override;
+/// A command that menu items and buttons share: the framework's action class.
+class FK_API TAction : public TContainedAction {
+  FK_CLASS(TAction, TContainedAction)
 
-  const String& Caption() const noexcept { return FCaption; }
-  void SetCaption(const String& Value) { FCaption = Value; }
-  const String& Hint() const noexcept { return FHint; }
-  void SetHint(const String& Value) { FHint = Value; }
-  bool Checked() const noexcept { return FChecked; }
-  void SetChecked(bool Value) noexcept { FChecked = Value; }
-  bool Enabled() const noexcept { return FEnabled; }
-  void SetEnabled(bool Value) noexcept { FEnabled = Value; }
-  /// Whether menu items and buttons of the action show; a hidden action still runs.
-  bool Visible() const noexcept { return FVisible; }
-  void SetVisible(bool Value) noexcept { FVisible = Value; }
-  /// The list the action belongs to; not owned.
-  TActionList* ActionList() const noexcept { return FActionList; }
+  /// The Kiln list the action belongs to; null outside one or in another framework's list.
+  TActionList* ActionList() const noexcept;
+  /// Joins `Value` (may be null) at its end.
   void SetActionList(TActionList* Value);
-
-  /// Runs `OnExecute` when the action is enabled and has one; true when it ran.
-  bool Execute();
-  /// Runs `OnUpdate`; true when there is one.
-  bool Update();
-
-  TNotifyEvent OnExecute;
-  TNotifyEvent OnUpdate;
-
-private:
-  friend class TActionList;
-  String FCaption;
-  String FHint;
-  bool FChecked = false;
-  bool FEnabled = true;
-  bool FVisible = true;
-  TActionList* FActionList = nullptr;
 };
 
 /// The actions of a window; it does not own them.
-class FK_API TActionList : public TComponent {
-  FK_CLASS(TActionList, TComponent)
-  void BeforeDestruction() override;
+class FK_API TActionList : public TContainedActionList {
+  FK_CLASS(TActionList, TContainedActionList)
 
-  int ActionCount() const noexcept { return static_cast<int>(FActions.size()); }
-  /// Raises `EListError` when out of range.
+  /// The action at `Index`; null for an action that is no Kiln action. Raises
+  /// `EListError` when out of range.
   TAction* Actions(int Index) const;
-  /// Updates every action, in order.
-  void UpdateActions();
-
-private:
-  friend class TAction;
-  std::vector<TAction*> FActions;
 };
 
 //===----------------------------------------------------------------------===//
@@ -99,6 +66,21 @@ class FK_API TMenuItem : public TComponent {
   /// Whether the entry can be chosen; not tied to the action.
   bool Enabled() const noexcept { return FEnabled; }
   void SetEnabled(bool Value) noexcept { FEnabled = Value; }
+  bool Visible() const noexcept { return FVisible; }
+  void SetVisible(bool Value) noexcept { FVisible = Value; }
+  /// The key that chooses the entry; 0 for none.
+  int ShortCut() const noexcept { return FShortCut; }
+  void SetShortCut(int Value) noexcept { FShortCut = Value; }
+  /// The entry's picture in its menu's images; -1 for none.
+  int ImageIndex() const noexcept { return FImageIndex; }
+  void SetImageIndex(int Value) noexcept { FImageIndex = Value; }
+  /// The entries of one group exclude each other when they are radio items.
+  int GroupIndex() const noexcept { return FGroupIndex; }
+  void SetGroupIndex(int Value) noexcept { FGroupIndex = Value; }
+  bool RadioItem() const noexcept { return FRadioItem; }
+  void SetRadioItem(bool Value) noexcept { FRadioItem = Value; }
+  /// A separator line: its caption is "-".
+  bool IsLine() const { return Caption() == "-"; }
   /// The linked action; not owned, and dropped when it goes.
   TAction* Action() const noexcept { return FAction; }
   void SetAction(TAction* Value);
@@ -108,10 +90,16 @@ class FK_API TMenuItem : public TComponent {
   TMenuItem* Items(int Index) const;
   /// Puts `Item` last under this one, out of any other; it is not owned.
   void Add(TMenuItem* Item);
+  /// Puts `Item` at `Index` (clamped) under this one, out of any other; not owned.
+  void Insert(int Index, TMenuItem* Item);
+  /// Takes sub-item `Index` out, without freeing it. Raises `EListError` when out of range.
+  void Delete(int Index);
+  /// The position of `Item` among the sub-items, or -1.
+  int IndexOf(const TMenuItem* Item) const noexcept;
   TMenuItem* ParentItem() const noexcept { return FParent; }
 
   /// Runs the action, or `OnClick` without one.
-  void Click();
+  virtual void Click();
   TNotifyEvent OnClick;
 
   void Notification(TComponent* AComponent, TOperation Operation) override;
@@ -120,6 +108,11 @@ private:
   String FCaption;
   bool FChecked = false;
   bool FEnabled = true;
+  bool FVisible = true;
+  bool FRadioItem = false;
+  int FShortCut = 0;
+  int FImageIndex = -1;
+  int FGroupIndex = 0;
   TAction* FAction = nullptr;
   TMenuItem* FParent = nullptr;
   std::vector<TMenuItem*> FItems;

@@ -289,6 +289,10 @@ void TCanvas::TextRect(const TRect& R, int X, int Y, const String& Text) {
 
 void TCanvas::Draw(int X, int Y, const String& PictureName) { Record(Format("Draw(%d,%d,%s)", X, Y, PictureName)); }
 
+void TCanvas::StretchDraw(const TRect& R, const String& PictureName) {
+  Record(Format("StretchDraw(%d,%d,%d,%d,%s)", R.Left, R.Top, R.Right, R.Bottom, PictureName));
+}
+
 int TCanvas::TextWidth(const String& Text) const {
   int Chars = 0;
   for (unsigned char C : Text)

@@ -208,6 +208,8 @@ class FK_API TCanvas : public TPersistent {
   void TextRect(const TRect& R, int X, int Y, const String& Text);
   /// Records "Draw(X,Y,Name)": a picture drawn by name.
   void Draw(int X, int Y, const String& PictureName);
+  /// Records "StretchDraw(L,T,R,B,Name)": a picture drawn by name, scaled into `R`.
+  void StretchDraw(const TRect& R, const String& PictureName);
   /// Text metrics in pixels at the canvas's pixels per inch.
   int TextWidth(const String& Text) const;
   int TextHeight(const String& Text) const;
