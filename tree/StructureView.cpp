@@ -40,15 +40,7 @@ constexpr std::uint16_t DeleteBlockingShift = 12;
 /// button after it share a number.
 constexpr int ButtonImages[5] = {4, 5, 6, 6, 7};
 
-/// Runs a host-facing operation that answers: a failure ends it with `Empty` and goes no
-/// further. Operations without an answer go through `RunIgnoringExceptions`.
-template <class R, class F> R Shielded(R Empty, F&& Fn) noexcept {
-  try {
-    return Fn();
-  } catch (...) {
-    return Empty;
-  }
-}
+using detail::Shielded;
 
 IPtr<IOTAStructureView> View() { return IDEService<IOTAStructureView>(); }
 
@@ -219,6 +211,46 @@ void TRootSprigStructureContext::DefaultNodeAction(const IPtr<IOTAStructureNode>
     auto* Component = dynamic_cast<TComponent*>(Sprig->Item());
     if (IPtr<IDesigner> Designer = RootDesigner(); Component && Designer) Designer->Edit(Component);
   });
+}
+
+//===----------------------------------------------------------------------===//
+// The popup menu
+//===----------------------------------------------------------------------===//
+
+void TRootSprigStructureContext::InitPopupMenu(const IPtr<IOTAStructureNode>& ANode,
+                                               const IPtr<IOTAStructureNodeMenuItem>& AMenu) {
+  RunIgnoringExceptions([&] { DoInitPopupMenu(ANode, AMenu); });
+}
+
+void TRootSprigStructureContext::DoInitPopupMenu(const IPtr<IOTAStructureNode>& ANode,
+                                                 const IPtr<IOTAStructureNodeMenuItem>& AMenu) {
+  if (!AMenu || !QueryAs<ISprig>(ANode) || !View() || !FRootSprig) return;
+  IPtr<IDesignLocalMenu> LocalMenu = QueryAs<IDesignLocalMenu>(FindRootDesigner(FRootSprig->Item()));
+  if (!LocalMenu) return;
+  TSprig* Sprig = SprigOf(ANode);
+  TLocalMenuTypes Kinds;
+  if (Sprig && Sprig->ShowRegisteredMenus()) Kinds = {lmModule, lmSelection, lmComponent};
+  IPtr<IPopupMenu> Popup = LocalMenu->BuildLocalMenu(Kinds);
+  if (!Popup) return;
+  IPtr<IMenuItem> Items = Popup->GetItems();
+  if (Sprig) AddSprigEntries(Sprig, Items);
+  if (Items->GetCount() > 0 && AMenu->Get_Count() > 0) Items->InsertLine(0, "");
+  for (int I = Items->GetCount() - 1; I >= 0; --I) AMenu->InsertItem(0, TreeIntf::WrapMenuItem(Items->GetItem(I)));
+  FLastPopup = Popup;
+}
+
+void TRootSprigStructureContext::AddSprigEntries(TSprig* Sprig, const IPtr<IMenuItem>& Items) {
+  Sprig->PrepareMenu(IPtr<IMenuItems>(Items));
+  int Types = Sprig->AddTypeCount();
+  if (Types <= 0) return;
+  Items->InsertLine(0, "");
+  TNotifyEvent OnAdd = TNotifyEvent::Bind<&TRootSprigStructureContext::HandleAddType>(this);
+  for (int I = Types - 1; I >= 0; --I) Items->InsertItem(0, Sprig->GetAddType(I), "", OnAdd, I);
+}
+
+void TRootSprigStructureContext::HandleAddType(TObject* ASender) {
+  auto* Entry = dynamic_cast<TComponent*>(ASender);
+  if (Entry && FRootSprig) FRootSprig->AddType(Entry->Tag());
 }
 
 //===----------------------------------------------------------------------===//

@@ -18,6 +18,7 @@
 #pragma once
 
 #include "tree/RootSprig.h"
+#include "tree/StructureMenus.h"
 
 namespace formkit {
 
@@ -180,6 +181,13 @@ class FK_API TRootSprigStructureContext : public TSprigStructureNode,
   void RemoveRootNode(const IPtr<IOTAStructureNode>&) override {}
   /// Gives the view the designer's selection.
   void ContextActivated() override;
+  /// Puts the designer's local menu for `ANode`, with the sprig's entries and its add
+  /// types above a separator, at the top of `AMenu`; keeps the popup built until the next.
+  void InitPopupMenu(const IPtr<IOTAStructureNode>& ANode, const IPtr<IOTAStructureNodeMenuItem>& AMenu) override;
+  /// An add-type entry was chosen: the root sprig adds the type of the entry's tag.
+  void HandleAddType(TObject* ASender);
+  /// The popup `InitPopupMenu` built last; null before the first.
+  const IPtr<IPopupMenu>& LastPopup() const noexcept { return FLastPopup; }
 
   // IOTAStructureNodeStatePreserver: the sprigs keep the expansion state --------
   TOTANodePreservationMode GetNodePreservationMode() override { return onpIntegrated; }
@@ -248,10 +256,14 @@ private:
   void DoDragOver(const IPtr<IOTAStructureNode>& ANode, const IPtr<IInterface>& ADataObject, TOTADragState AState,
                   TOTADropMode AMode, int& AEffect, TOTABool& AAccept);
   void DoDragDrop(const IPtr<IOTAStructureNode>& ANode, const IPtr<IInterface>& ADataObject);
+  void DoInitPopupMenu(const IPtr<IOTAStructureNode>& ANode, const IPtr<IOTAStructureNodeMenuItem>& AMenu);
+  /// The sprig's own entries and its add types, at the top of the popup's items.
+  void AddSprigEntries(TSprig* Sprig, const IPtr<IMenuItem>& Items);
   IPtr<IDesigner> RootDesigner() const;
 
   TRootSprig* FRootSprig;
   int FSelectLocks = 0;
+  IPtr<IPopupMenu> FLastPopup;
   bool FEditStateDirty = true;
   TEditState FEditState;
   bool FPendingClearSelection = false;

@@ -19,6 +19,18 @@
 
 namespace formkit {
 
+namespace detail {
+/// Runs a host-facing operation that answers: a failure ends it with `Empty` and goes no
+/// further. Operations without an answer go through `RunIgnoringExceptions`.
+template <class R, class F> R Shielded(R Empty, F&& Fn) noexcept {
+  try {
+    return Fn();
+  } catch (...) {
+    return Empty;
+  }
+}
+} // namespace detail
+
 /// One node of the host's structure view; the tree's sprigs stand behind them.
 struct FK_API IOTAStructureNode : IInterface {
   FK_INTERFACE(IOTAStructureNode, IInterface, "{5B0A3E51-6C14-4F0E-9C0B-2E7B1D7A4C11}")
@@ -111,6 +123,39 @@ struct FK_API IOTAStructureView290 : IOTAStructureView280 {
   virtual TOTABool GetBusy() = 0;
 };
 
+/// One entry of a menu the view and a context hand each other: the view's popup, or the
+/// entries a context offers for a node. Truth values are -1 and 0.
+struct FK_API IOTAStructureNodeMenuItem : IInterface {
+  FK_INTERFACE(IOTAStructureNodeMenuItem, IInterface, "{3B8E5D41-7C26-4A93-9F0E-21D6A4C8B577}")
+  /// Removes sub-entry `AIndex`.
+  virtual void DeleteItem(int AIndex) = 0;
+  virtual String Get_Caption() = 0;
+  virtual TOTABool Get_Checked() = 0;
+  /// The number of sub-entries.
+  virtual int Get_Count() = 0;
+  virtual TOTABool Get_Enabled() = 0;
+  virtual int Get_GroupIndex() = 0;
+  /// The picture in the view's image list; -1 for none.
+  virtual int Get_ImageIndex() = 0;
+  /// Sub-entry `AIndex`.
+  virtual IPtr<IOTAStructureNodeMenuItem> Get_Item(int AIndex) = 0;
+  virtual String Get_Name() = 0;
+  virtual TOTABool Get_RadioItem() = 0;
+  virtual int Get_ShortCut() = 0;
+  virtual TOTABool Get_Visible() = 0;
+  /// Puts `AItem` in as sub-entry `AIndex`.
+  virtual void InsertItem(int AIndex, const IPtr<IOTAStructureNodeMenuItem>& AItem) = 0;
+  /// Chooses the entry.
+  virtual void Invoke() = 0;
+};
+
+/// An entry that may run an action.
+struct FK_API IOTAStructureNodeMenuItem290 : IOTAStructureNodeMenuItem {
+  FK_INTERFACE(IOTAStructureNodeMenuItem290, IOTAStructureNodeMenuItem, "{9D14A6C3-5E82-4F07-B1A9-C6E3072D48F9}")
+  /// The action the entry runs, or null; not owned.
+  virtual TComponent* GetAction() = 0;
+};
+
 /// A context the view can ask for its identity, its top nodes and what to do with them.
 struct FK_API IOTAStructureContext110 : IOTAStructureContext {
   FK_INTERFACE(IOTAStructureContext110, IOTAStructureContext, "{6E2A9D13-0B7C-4F58-8A36-C1D4E9F27B66}")
@@ -130,6 +175,9 @@ struct FK_API IOTAStructureContext110 : IOTAStructureContext {
   virtual void RemoveRootNode(const IPtr<IOTAStructureNode>& ANode) = 0;
   /// The view shows this context from now on.
   virtual void ContextActivated() = 0;
+  /// The view is about to pop `AMenu` up over `ANode`: the context puts its entries at
+  /// its top.
+  virtual void InitPopupMenu(const IPtr<IOTAStructureNode>& ANode, const IPtr<IOTAStructureNodeMenuItem>& AMenu) = 0;
 };
 
 /// Whether the view or the context keeps the nodes' expansion state.

@@ -151,9 +151,11 @@ class FK_API TComponentRoot : public TInterfacedObject,
                               public IOTAAlignable,
                               public IFlipChildren,
                               public ISurfaceHost,
-                              public IModuleClassGroup {
+                              public IModuleClassGroup,
+                              public IDesignLocalMenu {
   FK_CLASS(TComponentRoot, TInterfacedObject)
-  FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren, ISurfaceHost, IModuleClassGroup)
+  FK_INTERFACES(IInternalRoot, IDesigner, IOTAAlignable, IFlipChildren, ISurfaceHost, IModuleClassGroup,
+                IDesignLocalMenu)
   // The tool facade (RootFormEditor.cpp) works on the module's streams and widget tree.
   friend class TOTAFormEditor;
   friend class TOTAComponent;
@@ -196,6 +198,10 @@ class FK_API TComponentRoot : public TInterfacedObject,
   bool ClassGroupKnown() override { return !FClassGroupName.empty(); }
   /// Keeps the name; whoever changes it reports the change.
   void SetClassGroupName(const String& Name) override;
+
+  /// The module's local menu as the host's menu layer builds it; null when the host has
+  /// no menu layer.
+  IPtr<IPopupMenu> BuildLocalMenu(TLocalMenuTypes Filter) override;
 
   /// The module as its surface sees it.
   IPtr<ISurfaceHost> AsSurfaceHost() { return IPtr<ISurfaceHost>(static_cast<ISurfaceHost*>(this)); }

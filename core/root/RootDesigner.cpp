@@ -112,6 +112,11 @@ TRect TComponentRoot::GetScrollRanges(const TPoint& ScrollPosition) {
   return Range;
 }
 
+IPtr<IPopupMenu> TComponentRoot::BuildLocalMenu(TLocalMenuTypes Filter) {
+  IPtr<IDesignLocalMenu> Host = QueryAs<IDesignLocalMenu>(GetEnvironment());
+  return Host ? Host->BuildLocalMenu(Filter) : nullptr;
+}
+
 bool TComponentRoot::SpecialPropertyHelp(const String&, String&, String&, int&) { return false; }
 
 void TComponentRoot::ShowHelp() {}

@@ -24,6 +24,12 @@ class TRecordingMenuItem : public TInterfacedObject, public IMenuItem {
   bool GetVisible() override { return true; }
   bool GetIsLine() override { return false; }
   TComponent* GetAction() override { return nullptr; }
+  IPtr<IMenuItem> InsertItem(int, const String& Caption, const String&, const TNotifyEvent&, int) override {
+    return Add(Caption);
+  }
+  int GetGroupIndex() override { return 0; }
+  bool GetRadioItem() override { return false; }
+  int GetShortCut() override { return 0; }
   std::vector<String> Items;
 
 private:

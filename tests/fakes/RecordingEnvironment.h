@@ -9,11 +9,17 @@
 #include "core/ComponentDesignerIntf.h"
 #include "tests/fakes/CallLog.h"
 
+#include <functional>
+
 namespace formkit::fakes {
 
-class TRecordingEnvironment : public TInterfacedObject, public IDesignEnvironment {
+class TRecordingEnvironment : public TInterfacedObject, public IDesignEnvironment, public IDesignLocalMenu {
   FK_CLASS(TRecordingEnvironment, TInterfacedObject)
-  FK_INTERFACES(IDesignEnvironment)
+  FK_INTERFACES(IDesignEnvironment, IDesignLocalMenu)
+
+  /// The host's menu layer building a module's local menu; unset, there is none.
+  std::function<IPtr<IPopupMenu>(TLocalMenuTypes)> LocalMenu;
+  IPtr<IPopupMenu> BuildLocalMenu(TLocalMenuTypes Filter) override { return LocalMenu ? LocalMenu(Filter) : nullptr; }
 
   explicit TRecordingEnvironment(TCallLog* Log = nullptr) : FLog(Log ? Log : &FOwnLog) {}
   TCallLog& Log() { return *FLog; }

@@ -9,5 +9,6 @@ FK_IMPLEMENT(TViewNode, "TreeFixture") {}
 FK_IMPLEMENT(TViewContext, "TreeFixture") {}
 FK_IMPLEMENT(TStructureViewBase, "TreeFixture") {}
 FK_IMPLEMENT(TStructureViewHost, "TreeFixture") {}
+FK_IMPLEMENT(TBridgeView, "TreeFixture") {}
 
 } // namespace formkit::fakes

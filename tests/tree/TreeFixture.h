@@ -88,6 +88,43 @@ private:
   TCallLog* FLog;
 };
 
+/// A host view with the update bracket, a busy flag and a selection the test sets.
+class TBridgeView : public TInterfacedObject, public IHalvernIDEServices, public IOTAStructureView290 {
+  FK_CLASS(TBridgeView, TInterfacedObject)
+  FK_INTERFACES(IHalvernIDEServices, IOTAStructureView290)
+  explicit TBridgeView(TCallLog* Log) : FLog(Log) {}
+
+  IPtr<IOTAStructureContext> Context;
+  std::vector<IPtr<IOTAStructureNode>> Selected;
+  bool Busy = false;
+
+  IPtr<IOTAStructureContext> GetCurrentContext() override { return Context; }
+  IPtr<IOTAStructureNode> GetFirstSelected() override { return Selected.empty() ? nullptr : Selected.front(); }
+  IPtr<IOTAStructureNode> GetNextSelected(const IPtr<IOTAStructureNode>& Node) override {
+    for (std::size_t I = 0; I + 1 < Selected.size(); ++I)
+      if (Selected[I].Get() == Node.Get()) return Selected[I + 1];
+    return nullptr;
+  }
+  int GetSelectedCount() override { return static_cast<int>(Selected.size()); }
+  void StructureChanged(bool Deferred) override {
+    FLog->Add(Deferred ? "View.StructureChanged(True)" : "View.StructureChanged(False)");
+  }
+  void SelectNode(const IPtr<IOTAStructureNode>& Node) override {
+    FLog->Add("View.SelectNode");
+    Selected.push_back(Node);
+  }
+  void BeginUpdate() override { FLog->Add("View.BeginUpdate"); }
+  void EndUpdate() override { FLog->Add("View.EndUpdate"); }
+  void ClearSelection() override {
+    FLog->Add("View.ClearSelection");
+    Selected.clear();
+  }
+  TOTABool GetBusy() override { return ToOTABool(Busy); }
+
+private:
+  TCallLog* FLog;
+};
+
 struct TreeFixture : KilnDesignFixture {
   /// Whether the Kiln package's own sprigs stay registered; without them the tree shows
   /// what the core's default sprigs make of a module.
