@@ -62,8 +62,35 @@ void RegisterSelectionEditor(TClass Class, TClass Editor) { Forward(RegisterSele
 void RegisterPropertyInCategory(const String& Category, TClass Class, PTypeInfo Type, const String& Name) {
   Forward(RegisterPropertyInCategoryProc, Category, Class, Type, Name);
 }
+void RegisterPropertyInCategory(const String& Category, const String& Name) {
+  RegisterPropertyInCategory(Category, nullptr, nullptr, Name);
+}
+void RegisterPropertyInCategory(const String& Category, TClass Class, const String& Name) {
+  RegisterPropertyInCategory(Category, Class, nullptr, Name);
+}
+void RegisterPropertyInCategory(const String& Category, PTypeInfo Type, const String& Name) {
+  RegisterPropertyInCategory(Category, nullptr, Type, Name);
+}
+void RegisterPropertyInCategory(const String& Category, PTypeInfo Type) {
+  RegisterPropertyInCategory(Category, nullptr, Type, String());
+}
 void RegisterPropertiesInCategory(const String& Category, TClass Class, const std::vector<String>& Names) {
   for (const String& Name : Names) RegisterPropertyInCategory(Category, Class, nullptr, Name);
+}
+void RegisterPropertiesInCategory(const String& Category, PTypeInfo Type, const std::vector<String>& Names) {
+  for (const String& Name : Names) RegisterPropertyInCategory(Category, nullptr, Type, Name);
+}
+void RegisterPropertiesInCategory(const String& Category, const std::vector<TCategoryFilter>& Filters) {
+  for (std::size_t I = 0; I < Filters.size(); ++I) {
+    const TCategoryFilter& F = Filters[I];
+    switch (F.VType) {
+    case TCategoryFilter::vtPointer: RegisterPropertyInCategory(Category, nullptr, F.Type, String()); break;
+    case TCategoryFilter::vtClass: RegisterPropertyInCategory(Category, F.Class, nullptr, String()); break;
+    case TCategoryFilter::vtAnsiString:
+    case TCategoryFilter::vtUnicodeString: RegisterPropertyInCategory(Category, nullptr, nullptr, F.Name); break;
+    default: throw Exception(sInvalidFilter, static_cast<int>(I), F.VType);
+    }
+  }
 }
 void ForceDemandLoadState(TDemandLoadState State) { Forward(ForceDemandLoadStateProc, State); }
 void EnableDemandLoadReport(bool Enable, bool Detailed) { Forward(EnableDemandLoadReportProc, Enable, Detailed); }

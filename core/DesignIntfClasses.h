@@ -70,9 +70,38 @@ FK_API void RegisterComponentEditor(TClass ComponentClass, TClass ComponentEdito
 FK_API void RegisterSelectionEditor(TClass AClass, TClass AEditor);
 FK_API void RegisterPropertyInCategory(const String& CategoryName, TClass ComponentClass, PTypeInfo PropertyType,
                                        const String& PropertyName);
+/// The shorter forms: what is not given matches any (a class, a type) or every name.
+FK_API void RegisterPropertyInCategory(const String& CategoryName, const String& PropertyName);
+FK_API void RegisterPropertyInCategory(const String& CategoryName, TClass ComponentClass, const String& PropertyName);
+FK_API void RegisterPropertyInCategory(const String& CategoryName, PTypeInfo PropertyType, const String& PropertyName);
+FK_API void RegisterPropertyInCategory(const String& CategoryName, PTypeInfo PropertyType);
 /// One category registration per filter.
 FK_API void RegisterPropertiesInCategory(const String& CategoryName, TClass ComponentClass,
                                          const std::vector<String>& PropertyNames);
+FK_API void RegisterPropertiesInCategory(const String& CategoryName, PTypeInfo PropertyType,
+                                         const std::vector<String>& PropertyNames);
+
+/// One element of a mixed list of category filters, with its value kind as the platform
+/// numbers it: a type (5, a pointer), a class (8) or a name (17, or 11 for a narrow
+/// string). Other kinds can be made, and are refused.
+struct FK_API TCategoryFilter {
+  static constexpr int vtInteger = 0, vtBoolean = 1, vtPointer = 5, vtClass = 8, vtAnsiString = 11,
+                       vtUnicodeString = 17;
+  int VType = vtUnicodeString;
+  PTypeInfo Type = nullptr;
+  TClass Class = nullptr;
+  String Name;
+  TCategoryFilter(PTypeInfo AType) : VType(vtPointer), Type(AType) {}
+  TCategoryFilter(TClass AClass) : VType(vtClass), Class(AClass) {}
+  TCategoryFilter(String AName) : Name(std::move(AName)) {}
+  TCategoryFilter(const char* AName) : Name(AName) {}
+  /// An element of another kind, such as a number.
+  TCategoryFilter(int Kind, std::nullptr_t) : VType(Kind) {}
+};
+/// One registration per element, in order: a type, a class or a name. Raises `Exception`
+/// `sInvalidFilter` with the index and the kind of the first element of another kind; the
+/// elements before it stay registered.
+FK_API void RegisterPropertiesInCategory(const String& CategoryName, const std::vector<TCategoryFilter>& Filters);
 FK_API void ForceDemandLoadState(TDemandLoadState State);
 FK_API void EnableDemandLoadReport(bool Enable, bool Detailed);
 FK_API void RegisterDragTarget(const String& SourceName, TClass TargetClass);

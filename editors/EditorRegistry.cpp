@@ -1,5 +1,6 @@
 //===- editors/EditorRegistry.cpp - Where design packages register editors ===//
 #include "editors/EditorRegistry.h"
+#include "editors/PropertyCategories.h"
 
 #include "core/DesignCore.h"
 #include "core/EditorGroups.h"
@@ -321,6 +322,7 @@ void InitializeDesignEditors() {
                     &detail::StopEditorRegistries);
   AddDesignCoreStep(TCoreStage::DefaultRegistrations, "DefaultPropertyEditors", &detail::RegisterDefaultEditors,
                     nullptr);
+  InitializePropertyCategories();
 }
 
 } // namespace formkit
