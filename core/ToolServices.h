@@ -23,6 +23,7 @@ class TStream;
 struct IStream;
 struct IDesigner;
 struct IOTAComponent;
+struct IOTAEditor;
 
 /// The address of an object of a designed module, as the tool interfaces pass it.
 using TOTAHandle = void*;
@@ -112,6 +113,16 @@ struct FK_API IOTAModule40 : IInterface {
   virtual int AddNotifier(const IPtr<IOTAModuleNotifier>& Notifier) = 0;
   /// Drops the notifier with that handle; other handles stay valid.
   virtual void RemoveNotifier(int Index) = 0;
+  /// The editor of the module's file at `Index`, or null.
+  virtual IPtr<IOTAEditor> GetModuleFileEditor(int Index) = 0;
+  /// Saves the module, under a new name when `ChangeName`; `ForceSave` saves it unchanged.
+  virtual bool Save(bool ChangeName, bool ForceSave) = 0;
+  /// Closes the module; `ForceClosed` closes it without asking to save. True when closed.
+  virtual bool CloseModule(bool ForceClosed) = 0;
+  /// Renames the module's file.
+  virtual void SetFileName(const String& Name) = 0;
+  /// Moves the module to the file system registered as `FileSystem`; empty for the disk.
+  virtual void SetFileSystem(const String& FileSystem) = 0;
 };
 struct FK_API IOTAModule50 : IOTAModule40 {
   FK_INTERFACE(IOTAModule50, IOTAModule40, "{E35F3FF0-C635-5005-B901-6676CB9F98E8}")

@@ -1,9 +1,13 @@
 //===- frameworks/kiln/Kiln.cpp - Starting and stopping the framework ----===//
 #include "frameworks/kiln/Kiln.h"
 
+#include "frameworks/kiln/KilnActions.h"
 #include "frameworks/kiln/KilnDockTabs.h"
+#include "frameworks/kiln/KilnMemo.h"
+#include "frameworks/kiln/KilnPictures.h"
 #include "frameworks/kiln/KilnSplitters.h"
 #include "frameworks/kiln/KilnToolBars.h"
+#include "frameworks/kiln/KilnValEdit.h"
 
 namespace formkit {
 
@@ -18,7 +22,9 @@ std::vector<TClass> KilnClasses() {
           TButton::StaticClass(),      TLabel::StaticClass(),      TEdit::StaticClass(),
           TCheckBox::StaticClass(),    TPanel::StaticClass(),      TTimer::StaticClass(),
           TStatusBar::StaticClass(),   TToolBar::StaticClass(),    TSplitter::StaticClass(),
-          TDockTabSet::StaticClass(),  TScrollBox::StaticClass(),  TShape::StaticClass()};
+          TDockTabSet::StaticClass(),  TScrollBox::StaticClass(),  TShape::StaticClass(),
+          TMemo::StaticClass(),        TImage::StaticClass(),      TPaintBox::StaticClass(),
+          TAction::StaticClass(),      TActionList::StaticClass(), TValueListEditor::StaticClass()};
 }
 } // namespace
 

@@ -151,6 +151,17 @@ class TRecordingModule : public TInterfacedObject, public IDesignerViewModule, p
     return AddToList(Notifiers, QueryAs<IInterface>(Notifier));
   }
   void RemoveNotifier(int Index) override { Notifiers->Put(Index, nullptr); }
+  IPtr<IOTAEditor> GetModuleFileEditor(int) override { return nullptr; }
+  bool Save(bool, bool) override {
+    FLog->Add("SaveModule");
+    return true;
+  }
+  bool CloseModule(bool) override {
+    FLog->Add("CloseModule");
+    return true;
+  }
+  void SetFileName(const String& Name) override { FLog->Add("SetFileName(" + Name + ")"); }
+  void SetFileSystem(const String& Name) override { FLog->Add("SetFileSystem(" + Name + ")"); }
   /// The module goes away: each of its notifiers hears `Destroyed`.
   void TellDestroyed() { ForEach(Notifiers, &TOTAClass::NotifyDestroyed); }
   /// The module's notifiers; an index is a handle.

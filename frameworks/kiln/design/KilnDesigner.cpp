@@ -1,6 +1,10 @@
 //===- frameworks/kiln/design/KilnDesigner.cpp - The Kiln designer -------===//
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "frameworks/kiln/design/KilnActionEditors.h"
+#include "frameworks/kiln/design/KilnEditors.h"
 #include "frameworks/kiln/design/KilnSprigs.h"
+#include "frameworks/kiln/design/PicEdit.h"
+#include "frameworks/kiln/design/StrEdit.h"
 
 #include "core/Designers.h"
 #include "editors/EditorRegistry.h"
@@ -136,6 +140,10 @@ void RegisterKilnDesignPackage() {
   RegisterComponentGuidelines(TCustomForm::StaticClass(), TCustomFormGuidelines::StaticClass());
   RegisterSelectionEditor(TDataModule::StaticClass(), TDataModuleSelectionEditor::StaticClass());
   RegisterKilnSprigs();
+  RegisterPictureEditors();
+  RegisterKilnActionEditors();
+  RegisterStringEditors();
+  RegisterKilnEditors();
   // Creation on a surface scales by the pixels per inch of the parent control.
   GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {
     auto* Control = dynamic_cast<TControl*>(ExtractComponent(Item));
