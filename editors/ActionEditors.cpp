@@ -66,16 +66,6 @@ TContainedAction* FindPrototype(TComponent* Resource, TClass Class) {
   return nullptr;
 }
 
-void CopyPrototype(TContainedAction* From, TContainedAction* To) {
-  To->SetCaption(From->Caption());
-  To->SetChecked(From->Checked());
-  To->SetEnabled(From->Enabled());
-  To->SetHelpContext(From->HelpContext());
-  To->SetHint(From->Hint());
-  To->SetImageIndex(From->ImageIndex());
-  To->SetShortCut(From->ShortCut());
-  To->SetVisible(From->Visible());
-}
 
 /// Strips prefix `P` (without its blanks) from `Name` when `Name` is more than two
 /// characters longer and starts with it in any case.
@@ -246,13 +236,24 @@ TBasicAction* CreateAction(TComponent* AOwner, TClass ActionClass, const String&
       if (TObjectGuard<TIDEActions> IDEActions = IDEActionsOf(GetIDEActions(FrameworkType)))
         IDEActions->AssignAction(Prototype, Action);
       else
-        CopyPrototype(Prototype, Action);
+        CopyActionProperties(Prototype, Action);
     }
     return Action;
   } catch (...) {
     Action->Destroy();
     throw;
   }
+}
+
+void CopyActionProperties(TContainedAction* From, TContainedAction* To) {
+  To->SetCaption(From->Caption());
+  To->SetChecked(From->Checked());
+  To->SetEnabled(From->Enabled());
+  To->SetHelpContext(From->HelpContext());
+  To->SetHint(From->Hint());
+  To->SetImageIndex(From->ImageIndex());
+  To->SetShortCut(From->ShortCut());
+  To->SetVisible(From->Visible());
 }
 
 String GetNewActionName(TBasicAction* Action, const String& FrameworkType) {

@@ -161,6 +161,9 @@ FK_API void EnumActions(const TEnumActionProc& Proc, void* Info, const String& F
 /// A class-shaped name for a new action: its class name with the prefixes "T", the
 /// framework and the category stripped, and "T" and the category (without blanks) in front.
 [[nodiscard]] FK_API String GetNewActionName(TBasicAction* Action, const String& FrameworkType);
+/// Gives `To` the caption, check, enabling, help context, hint, picture, short cut and
+/// visibility of `From`: what a new action takes from its prototype.
+FK_API void CopyActionProperties(TContainedAction* From, TContainedAction* To);
 
 //===----------------------------------------------------------------------===//
 // Resources

@@ -49,15 +49,7 @@ void TKilnIDEActions::AssignAction(TBasicAction* Source, TBasicAction* Dest) {
   inherited::AssignAction(Source, Dest);
   auto* From = dynamic_cast<TContainedAction*>(Source);
   auto* To = dynamic_cast<TContainedAction*>(Dest);
-  if (!From || !To) return;
-  To->SetCaption(From->Caption());
-  To->SetChecked(From->Checked());
-  To->SetEnabled(From->Enabled());
-  To->SetHelpContext(From->HelpContext());
-  To->SetHint(From->Hint());
-  To->SetImageIndex(From->ImageIndex());
-  To->SetShortCut(From->ShortCut());
-  To->SetVisible(From->Visible());
+  if (From && To) CopyActionProperties(From, To);
 }
 
 String ProjectFrameworkType() {
