@@ -1,5 +1,6 @@
 //===- frameworks/kiln/design/KilnDesigner.cpp - The Kiln designer -------===//
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "frameworks/kiln/design/KilnCategories.h"
 #include "frameworks/kiln/design/KilnActionEditors.h"
 #include "frameworks/kiln/design/KilnEditors.h"
 #include "frameworks/kiln/design/KilnSprigs.h"
@@ -140,6 +141,7 @@ void RegisterKilnDesignPackage() {
   RegisterComponentGuidelines(TCustomForm::StaticClass(), TCustomFormGuidelines::StaticClass());
   RegisterSelectionEditor(TDataModule::StaticClass(), TDataModuleSelectionEditor::StaticClass());
   RegisterKilnSprigs();
+  RegisterKilnCategories();
   RegisterPictureEditors();
   RegisterKilnActionEditors();
   RegisterStringEditors();
