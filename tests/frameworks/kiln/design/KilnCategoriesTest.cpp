@@ -30,10 +30,12 @@ TEST_F(KilnDesignFixture, EveryKilnPropertyButTheNameStandsInACategory) {
                        TToolBar::StaticClass(), TSplitter::StaticClass(), TScrollBox::StaticClass(),
                        TShape::StaticClass(), TMemo::StaticClass(), TImage::StaticClass(), TPaintBox::StaticClass(),
                        TAction::StaticClass(), TRadioButton::StaticClass(), TComboBox::StaticClass(),
-                       TListBox::StaticClass(), TBevel::StaticClass()})
-    for (PPropInfo Prop : Class->Properties())
-      if (Prop->Name != "Name" && Prop->Name != "Tag")
-        EXPECT_FALSE(CategoriesOf(Class, Prop->Name).empty()) << Class->ClassName << "." << Prop->Name;
+                       TListBox::StaticClass(), TBevel::StaticClass()}) {
+    for (PPropInfo Prop : Class->Properties()) {
+      if (Prop->Name == "Name" || Prop->Name == "Tag") continue;
+      EXPECT_FALSE(CategoriesOf(Class, Prop->Name).empty()) << Class->ClassName << "." << Prop->Name;
+    }
+  }
   EXPECT_EQ(CategoriesOf(TButton::StaticClass(), "Caption"), (std::vector<String>{"Localizable", "Visual"}));
   EXPECT_EQ(CategoriesOf(TButton::StaticClass(), "OnClick"), (std::vector<String>{"Mouse"}));
   EXPECT_TRUE(CategoriesOf(TButton::StaticClass(), "Name").empty());
