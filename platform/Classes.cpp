@@ -575,6 +575,10 @@ TCollectionItem* TCollection::FindItemID(int ID) const {
   return nullptr;
 }
 
+String TCollection::GetItemAttr(int Index, int ItemIndex) {
+  return Index == 0 ? Items(ItemIndex)->GetDisplayName() : String();
+}
+
 void TCollection::EndUpdate() {
   if (FUpdateCount > 0 && --FUpdateCount == 0) Changed();
 }

@@ -412,6 +412,12 @@ class FK_API TCollection : public TPersistent {
   void Delete(int Index);
   void Clear();
   TCollectionItem* FindItemID(int ID) const;
+  /// The number of columns an editor lists the items in; 0 for one column of display names.
+  virtual int GetAttrCount() { return 0; }
+  /// The caption of column `Index`; empty by default.
+  virtual String GetAttr(int /*Index*/) { return String(); }
+  /// The text of item `ItemIndex` in column `Index`; by default its display name.
+  virtual String GetItemAttr(int Index, int ItemIndex);
   void BeginUpdate() noexcept { ++FUpdateCount; }
   void EndUpdate();
   int UpdateCount() const noexcept { return FUpdateCount; }
