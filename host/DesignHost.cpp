@@ -269,7 +269,10 @@ IPtr<IRoot> TDesignSession::NewModule(const String& Path, const String& Ancestor
 void TDesignSession::Save(const IPtr<IRoot>& Root) {
   IPtr<IRoot> Master = Root->GetMasterView() ? Root->GetMasterView() : Root;
   Master->Save();
-  if (THostModule* Module = ModuleOf(Master)) Module->SaveSource();
+  if (THostModule* Module = ModuleOf(Master)) {
+    Module->SaveSource();
+    Module->MarkSaved();
+  }
 }
 
 void TDesignSession::SaveAs(const IPtr<IRoot>& Root, const String& Path) {

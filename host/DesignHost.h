@@ -27,6 +27,10 @@
 namespace formkit {
 
 FK_EXCEPTION(EHostError, Exception);
+/// What the host raises for a module, component, property, class or file it does not find.
+FK_EXCEPTION(EHostNotFound, EHostError);
+
+FK_RESOURCESTRING(sFileExists, "%s exists already");
 
 class TDesignSession;
 
@@ -162,7 +166,10 @@ class FK_API THostModule : public TInterfacedObject, public IDesignerViewModule 
   /// Refuses while `ReadOnly`.
   void CheckWritable() override;
   void Close() override {}
+  /// Whether the module changed since it was opened or last saved.
   bool IsModified() const noexcept { return FModified; }
+  /// The module and its source were written.
+  void MarkSaved() noexcept { FModified = false; }
 
   // IDesignerViewModule: the view list is kept in the source
   void GetViewNames(TStrings* Strings) override;

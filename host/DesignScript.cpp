@@ -26,8 +26,6 @@ FK_RESOURCESTRING(sStepArguments, "'%s' needs %s");
 FK_RESOURCESTRING(sNoModule, "no module is open");
 FK_RESOURCESTRING(sNotANumber, "'%s' is not a number");
 FK_RESOURCESTRING(sUnknownKey, "unknown key '%s'");
-FK_RESOURCESTRING(sUnknownClass, "Class %s not found");
-FK_RESOURCESTRING(sNoModuleNamed, "no open module is named '%s'");
 FK_RESOURCESTRING(sExpectation, "%s shows '%s', not '%s'");
 FK_RESOURCESTRING(sUnknownHow, "unknown way '%s'");
 
@@ -42,7 +40,7 @@ TComponent* ComponentNamed(const IPtr<IRoot>& Root, const String& Name) {
     std::istringstream Path(Name);
     for (String Part; C && std::getline(Path, Part, '.');) C = C->FindComponent(Part);
   }
-  if (!C) throw EHostError(sNoSuchComponent, Root->GetRootName(), Name);
+  if (!C) throw EHostNotFound(sNoSuchComponent, Root->GetRootName(), Name);
   return C;
 }
 
@@ -54,24 +52,20 @@ std::vector<IPtr<IProperty>> InspectorList(const IPtr<IRoot>& Root, TComponent* 
   return List;
 }
 
-namespace {
-
-IPtr<IProperty> PropertyAt(const IPtr<IRoot>& Root, const String& Path) {
+IPtr<IProperty> InspectorProperty(const IPtr<IRoot>& Root, const String& Path) {
   std::size_t Dot = Path.rfind('.');
   if (Dot == String::npos || Dot == 0 || Dot + 1 == Path.size()) throw EHostError(sNotPropertyPath, Path);
   String Name = Path.substr(0, Dot), Property = Path.substr(Dot + 1);
   for (const IPtr<IProperty>& P : InspectorList(Root, ComponentNamed(Root, Name)))
     if (SameText(P->GetName(), Property)) return P;
-  throw EHostError(sNoSuchProperty, Name, Property);
+  throw EHostNotFound(sNoSuchProperty, Name, Property);
 }
-
-} // namespace
 
 void SetPropertyText(const IPtr<IRoot>& Root, const String& Path, const String& Value) {
-  PropertyAt(Root, Path)->SetValue(Value);
+  InspectorProperty(Root, Path)->SetValue(Value);
 }
 
-String PropertyText(const IPtr<IRoot>& Root, const String& Path) { return PropertyAt(Root, Path)->GetValue(); }
+String PropertyText(const IPtr<IRoot>& Root, const String& Path) { return InspectorProperty(Root, Path)->GetValue(); }
 
 //===----------------------------------------------------------------------===//
 // TFileJournal
@@ -104,11 +98,15 @@ void TFileJournal::Restore() noexcept {
 // The steps
 //===----------------------------------------------------------------------===//
 
-namespace {
+namespace detail {
 
 class TScriptRun {
 public:
   explicit TScriptRun(std::ostream& Out) : FOut(Out) {}
+
+  TDesignSession& Session() noexcept { return FSession; }
+  const IPtr<IRoot>& CurrentOrNull() const noexcept { return FCurrent; }
+  void Use(const IPtr<IRoot>& Module) { FCurrent = Module; }
 
   void Step(const std::vector<String>& Words, const String& Rest) {
     const String& Verb = Words[0];
@@ -124,7 +122,7 @@ public:
     } else if (Verb == "use") {
       Need(1, "a module NAME");
       IPtr<IRoot> Found = FSession.Find(Words[1]);
-      if (!Found) throw EHostError(sNoModuleNamed, Words[1]);
+      if (!Found) throw EHostNotFound(sNoModuleNamed, Words[1]);
       Use(Found);
     } else if (Verb == "select") {
       Need(1, "a component NAME");
@@ -143,7 +141,7 @@ public:
     } else if (Verb == "create") {
       Need(3, "CLASS X Y");
       TClass Class = GetClass(Words[1]);
-      if (!Class) throw EHostError(sUnknownClass, Words[1]);
+      if (!Class) throw EHostNotFound(sUnknownClass, Words[1]);
       FSession.Environment().ToolClass = Class;
       auto Disarm = Finally([this]() noexcept { FSession.Environment().ToolClass = nullptr; });
       int X = Number(Words[2]), Y = Number(Words[3]);
@@ -256,7 +254,6 @@ private:
            << std::filesystem::path(Module->GetView(I)->GetFileName()).filename().string() << "\n";
     }
   }
-  void Use(const IPtr<IRoot>& Module) { FCurrent = Module; }
   const IPtr<IRoot>& Current() const {
     if (!FCurrent || !FCurrent->GetRoot()) throw EHostError(sNoModule);
     return FCurrent;
@@ -322,6 +319,12 @@ private:
   IPtr<IRoot> FCurrent;
 };
 
+} // namespace detail
+
+namespace {
+
+using detail::TScriptRun;
+
 std::vector<String> WordsOf(const String& Line, String& Rest) {
   std::vector<String> Words;
   std::istringstream In(Line);
@@ -339,15 +342,31 @@ std::vector<String> WordsOf(const String& Line, String& Rest) {
 
 } // namespace
 
+//===----------------------------------------------------------------------===//
+// TDesignSteps
+//===----------------------------------------------------------------------===//
+
+TDesignSteps::TDesignSteps(std::ostream& Out) : FRun(std::make_unique<TScriptRun>(Out)) {}
+TDesignSteps::~TDesignSteps() = default;
+
+void TDesignSteps::Step(const std::vector<String>& Words, const String& Rest) { FRun->Step(Words, Rest); }
+
+void TDesignSteps::Step(const std::vector<String>& Words) {
+  if (Words.empty()) return;
+  String Rest;
+  for (std::size_t I = 2; I < Words.size(); ++I) Rest += (I > 2 ? " " : "") + Words[I];
+  FRun->Step(Words, Rest);
+}
+
+TDesignSession& TDesignSteps::Session() noexcept { return FRun->Session(); }
+const IPtr<IRoot>& TDesignSteps::Current() const noexcept { return FRun->CurrentOrNull(); }
+void TDesignSteps::Use(const IPtr<IRoot>& Module) { FRun->Use(Module); }
+TFileJournal& TDesignSteps::Journal() noexcept { return FRun->Journal(); }
+
 void RunDesignSteps(const std::vector<std::vector<String>>& Steps, std::ostream& Out) {
-  TScriptRun Run(Out);
+  TDesignSteps Run(Out);
   auto PutBack = OnFailure([&]() noexcept { Run.Journal().Restore(); });
-  for (const std::vector<String>& Words : Steps) {
-    if (Words.empty()) continue;
-    String Rest;
-    for (std::size_t I = 2; I < Words.size(); ++I) Rest += (I > 2 ? " " : "") + Words[I];
-    Run.Step(Words, Rest);
-  }
+  for (const std::vector<String>& Words : Steps) Run.Step(Words);
 }
 
 void RunDesignScript(const String& Path, std::ostream& Out) {

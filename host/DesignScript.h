@@ -22,10 +22,13 @@
 
 #include <iosfwd>
 #include <map>
+#include <memory>
 #include <optional>
 #include <vector>
 
 namespace formkit {
+
+class TDesignSession;
 
 /// The steps of a script, as the command's help lists them.
 #define DESIGN_SCRIPT_HELP                                                                         \
@@ -61,12 +64,19 @@ namespace formkit {
   "  close                     closes the current module\n"                                         \
   "  expect NAME.PROP VALUE    stops the script unless the property shows VALUE\n"
 
+FK_RESOURCESTRING(sUnknownClass, "Class %s not found");
+FK_RESOURCESTRING(sNoModuleNamed, "no open module is named '%s'");
+
 /// The component named `Name` of the open module `Root` (its own name gives its root;
 /// "Frame11.Button3" a component of its nested frame Frame11).
-/// Raises `EHostError` "Module %s has no component named '%s'".
+/// Raises `EHostNotFound` "Module %s has no component named '%s'".
 [[nodiscard]] FK_API TComponent* ComponentNamed(const IPtr<IRoot>& Root, const String& Name);
 /// The properties the inspector lists for `Component` of `Root`, in its order.
 [[nodiscard]] FK_API std::vector<IPtr<IProperty>> InspectorList(const IPtr<IRoot>& Root, TComponent* Component);
+/// The inspector's editor of `Path` ("Button1.Caption") of the open module `Root`.
+/// Raises `EHostNotFound` "Component %s has no property '%s'" (or the component's
+/// message), `EHostError` "'%s' is not of the form NAME.PROPERTY".
+[[nodiscard]] FK_API IPtr<IProperty> InspectorProperty(const IPtr<IRoot>& Root, const String& Path);
 /// Sets `Path` ("Button1.Caption") of the open module `Root` to `Value` through the
 /// property's editor. Raises with the editor's message when it rejects the value.
 FK_API void SetPropertyText(const IPtr<IRoot>& Root, const String& Path, const String& Value);
@@ -84,6 +94,39 @@ public:
 
 private:
   std::map<String, std::optional<std::vector<std::uint8_t>>> FOriginals;
+};
+
+namespace detail {
+class TScriptRun;
+} // namespace detail
+
+/// A design session driven step by step, as a script's lines drive it: the steps of
+/// `DESIGN_SCRIPT_HELP`, each through the interfaces an IDE uses, on the current module.
+/// Owns its session (one at a time in a process) and the journal of the files its saves
+/// wrote; a failing step raises with the engine's message.
+class FK_API TDesignSteps {
+public:
+  /// Steps that print (`views`) print on `Out`, which must outlive this object.
+  explicit TDesignSteps(std::ostream& Out);
+  ~TDesignSteps();
+  TDesignSteps(const TDesignSteps&) = delete;
+  TDesignSteps& operator=(const TDesignSteps&) = delete;
+
+  /// Takes the step `Words`; `Rest` is the line after the second word, as typed.
+  void Step(const std::vector<String>& Words, const String& Rest);
+  /// Takes the step `Words`, its rest being the words after the second joined by blanks.
+  void Step(const std::vector<String>& Words);
+
+  TDesignSession& Session() noexcept;
+  /// The module the steps work on; null before one is opened.
+  [[nodiscard]] const IPtr<IRoot>& Current() const noexcept;
+  /// Makes the open module `Module` the current one.
+  void Use(const IPtr<IRoot>& Module);
+  /// The files the saves wrote, as they were before.
+  TFileJournal& Journal() noexcept;
+
+private:
+  std::unique_ptr<detail::TScriptRun> FRun;
 };
 
 /// Runs the script at `Path`, telling each step done on `Out`. Raises `EHostError`

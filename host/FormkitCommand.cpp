@@ -8,6 +8,7 @@
 #include "host/DesktopRender.h"
 #include "host/FormRender.h"
 #include "host/StructurePrint.h"
+#include "host/Studio.h"
 #include "platform/TypInfo.h"
 
 #include <filesystem>
@@ -20,7 +21,6 @@ namespace formkit {
 FK_RESOURCESTRING(sUnknownSubcommand, "Unknown subcommand '%s'. Try 'formkit --help'.");
 FK_RESOURCESTRING(sUnknownOption, "Unknown option '%s' of 'formkit %s'. Try 'formkit %s --help'.");
 FK_RESOURCESTRING(sMissingArguments, "'formkit %s' needs %s. Try 'formkit %s --help'.");
-FK_RESOURCESTRING(sFileExists, "%s exists already");
 
 namespace {
 
@@ -47,6 +47,7 @@ const char* const MainHelp =
     "  desktop render FILE OUT.png [--monitors MONITORS]\n"
     "                                 draws the layout a desktop file saves\n"
     "  addin FILE ACTION ARGUMENTS... lists and edits components as an add-in does\n"
+    "  studio [DIR] [--port N]        serves a form designer to the browser on 127.0.0.1\n"
     "\n"
     "'formkit SUBCOMMAND --help' tells more of each.\n"
     "\n"
@@ -277,6 +278,15 @@ const std::map<String, TSubcommand>& Subcommands() {
           try {
             RunAddinCommand(Args, Out);
           } catch (const EAddinUsageError& E) {
+            throw EUsageError(E.Message());
+          }
+        }}},
+      {"studio",
+       {"[DIR] [--port N]", STUDIO_COMMAND_HELP, 0,
+        [](const std::vector<String>& Args, std::ostream& Out) {
+          try {
+            RunStudioCommand(Args, Out);
+          } catch (const EStudioUsageError& E) {
             throw EUsageError(E.Message());
           }
         }}},

@@ -54,4 +54,13 @@ void FinalizeKiln() {
 
 bool KilnInitialized() noexcept { return KilnStarts > 0; }
 
+std::vector<TClass> KilnPaletteClasses() {
+  return {TButton::StaticClass(),    TLabel::StaticClass(),     TEdit::StaticClass(),
+          TMemo::StaticClass(),      TCheckBox::StaticClass(),  TPanel::StaticClass(),
+          TScrollBox::StaticClass(), TShape::StaticClass(),     TImage::StaticClass(),
+          TPaintBox::StaticClass(),  TSplitter::StaticClass(),  TStatusBar::StaticClass(),
+          TToolBar::StaticClass(),   TDockTabSet::StaticClass(), TValueListEditor::StaticClass(),
+          TTimer::StaticClass(),     TActionList::StaticClass()};
+}
+
 } // namespace formkit

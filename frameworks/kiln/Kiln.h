@@ -30,4 +30,9 @@ FK_API void FinalizeKiln();
 /// True between the first `InitializeKiln` and the last `FinalizeKiln`.
 FK_API bool KilnInitialized() noexcept;
 
+/// The components a palette offers to place on a module: the registered classes
+/// without the abstract bases, the module classes (forms, frames, data modules) and
+/// the actions, which their lists make. In the order of the framework's pages.
+[[nodiscard]] FK_API std::vector<TClass> KilnPaletteClasses();
+
 } // namespace formkit
