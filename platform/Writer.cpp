@@ -29,6 +29,9 @@ struct TChildList {
   /// What a reader's parent holds while the children are read: the ancestor's children
   /// (as identity of the ancestor component) followed by the new ones.
   std::vector<const void*> Order;
+  /// The child being written as `Order` holds it when the ancestor has it: its ancestor
+  /// component, from the ancestor's tree.
+  const void* Inherited = nullptr;
 };
 
 } // namespace detail
@@ -522,6 +525,9 @@ void TWriter::WriteComponent(TComponent* Component) {
     FAncestor = nullptr;
   }
   FAncestorInherited = FAncestor != nullptr;
+  // A nested frame new to this parent gets its module as ancestor below, but the reader
+  // still adds it as a new child.
+  if (FChildren) FChildren->Inherited = FAncestor;
   if (OnFindAncestor) {
     auto* A = dynamic_cast<TComponent*>(FAncestor);
     if (!FAncestor || A) {
@@ -559,8 +565,8 @@ bool TWriter::TakesChildPosition(TComponent* Instance) {
   // Mirror what the reader will do: a new child lands at the end, and a child that
   // does not stand where the reader will have it is moved there.
   auto& Order = FChildren->Order;
-  const void* Key = FAncestor ? static_cast<const void*>(FAncestor) : static_cast<const void*>(Instance);
-  if (!FAncestor || FAncestorMoved) Order.push_back(Key);
+  const void* Key = FAncestorInherited ? FChildren->Inherited : static_cast<const void*>(Instance);
+  if (!FAncestorInherited || FAncestorMoved) Order.push_back(Key);
   if (FChildPos < Order.size() && Order[FChildPos] == Key) return false;
   auto It = std::find(Order.begin(), Order.end(), Key);
   if (It == Order.end()) return false;

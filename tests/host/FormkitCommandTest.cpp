@@ -270,3 +270,22 @@ TEST_F(ArrangeCommandTest, AComponentDroppedOnANestedFrameBelongsToTheFrameAndIs
 }
 
 } // namespace
+
+namespace formkit::hosttest {
+namespace {
+
+// A nested frame is a new child of a form without ancestor, like any other: the children
+// after it keep their places without positions in the file.
+TEST_F(ExamplesFixture, FormWithNestedFrameSavesWithoutChildPositions) {
+  ASSERT_EQ(Run({"set", At("Form1.kfm"), "Button1.Caption", "Yes"}), feOK) << Err.str();
+  String Saved = Read(Dir / "Form1.kfm");
+  EXPECT_NE(Saved.find("  object Button1: TButton\n"), String::npos) << Saved;
+  EXPECT_EQ(Saved.find(": TTimer ["), String::npos) << Saved;
+  ASSERT_EQ(Run({"tree", At("Form1.kfm")}), feOK) << Err.str();
+  EXPECT_NE(Out.str().find("  Frame11 (TFrame1)\n    Label1 (TLabel)\n    Edit1 (TEdit)\n  Button1 (TButton)\n"),
+            String::npos)
+      << Out.str();
+}
+
+} // namespace
+} // namespace formkit::hosttest
