@@ -14,6 +14,7 @@
 namespace formkit {
 
 FK_RESOURCESTRING(sInvalidComponentName, "'%s' is not a valid component name");
+FK_RESOURCESTRING(sInvalidMethodName, "'%s' is not a valid method name");
 FK_RESOURCESTRING(sModuleReadOnly, "Module %s is read-only");
 FK_RESOURCESTRING(sModuleNotFound, "Module %s not found");
 FK_RESOURCESTRING(sOneSession, "Only one design session can run at a time");
@@ -113,7 +114,13 @@ String THostModule::SourceFileName() const {
 String THostModule::GetUnitName() { return BaseNameOf(FFileName); }
 
 void THostModule::CreateMethod(const String& Name, const IPtr<IEventInfo>& EventInfo) {
+  if (!Name.empty() && !IsValidIdent(Name)) throw EComponentDesignerException(sInvalidMethodName, Name);
   FSource.AddMethod(Name, ParamsOf(EventInfo));
+}
+
+void THostModule::RenameMethod(const String& CurName, const String& NewName) {
+  if (!IsValidIdent(NewName)) throw EComponentDesignerException(sInvalidMethodName, NewName);
+  FSource.RenameMethod(CurName, NewName);
 }
 
 String THostModule::GetAncestorClassName(const String&) { return FSource.AncestorClass; }

@@ -132,6 +132,7 @@ class FK_API THostModule : public TInterfacedObject, public IDesignerViewModule 
 
   // IDesignerModule
   void Activate(bool) override {}
+  /// Adds the handler to the source; refuses a name that is no identifier.
   void CreateMethod(const String& Name, const IPtr<IEventInfo>& EventInfo) override;
   void Modified() override { FModified = true; }
   String GetModuleIdentifier() override { return ""; }
@@ -147,7 +148,8 @@ class FK_API THostModule : public TInterfacedObject, public IDesignerViewModule 
   void RenameComponent(const IPtr<ICompInfo>& Info, const String& CurName, const String& NewName) override;
   /// Refuses a name that is no identifier.
   void ValidateComponentName(const IPtr<ICompInfo>& Info, const String& NewName) override;
-  void RenameMethod(const String& CurName, const String& NewName) override { FSource.RenameMethod(CurName, NewName); }
+  /// Refuses a name that is no identifier.
+  void RenameMethod(const String& CurName, const String& NewName) override;
   void ShowMethod(const String&) override {}
   void GetComponentNames(const TGetStrProc&) override {}
   void MakeComponentLinkable(const String&) override {}

@@ -177,6 +177,8 @@ TEST_F(StudioFixture, StudioRefusesBadRequestsAndChangesNothing) {
        "Component Button1 has no property 'Nope'"},
       {"POST", "/api/modules/Form1/property", R"({"component": "Button1", "property": "Left", "value": "abc"})", 422,
        "'abc' is not a valid integer value"},
+      {"POST", "/api/modules/Form1/bind", R"({"component": "Button1", "event": "OnClick", "handler": "not a name"})", 422,
+       "'not a name' is not a valid method name"},
       {"POST", "/api/modules/Form1/rename", R"({"component": "Button1", "name": "Button2"})", 422,
        "A component named Button2 already exists"},
       {"POST", "/api/modules/Form1/select", R"({"names": ["Button1", "Nope"]})", 404,
