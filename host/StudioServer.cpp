@@ -26,7 +26,8 @@ namespace {
 std::atomic<httplib::Server*> GRunning{nullptr};
 
 TStudioRequest RequestOf(const httplib::Request& In) {
-  TStudioRequest Request{In.method, In.path, In.body, {}};
+  // A HEAD asks what a GET would answer; the server leaves out the body.
+  TStudioRequest Request{In.method == "HEAD" ? String("GET") : In.method, In.path, In.body, {}};
   for (const auto& [Key, Value] : In.params) Request.Query.emplace(Key, Value);
   return Request;
 }
