@@ -1,5 +1,5 @@
 # The commands a person types. Each installs what a fresh machine lacks first.
-.PHONY: demo test fuzz bench test-build release threads deps clean
+.PHONY: demo studio test fuzz bench test-build release threads deps clean
 
 deps:
 	@bash scripts/install-deps
@@ -10,6 +10,15 @@ demo: deps
 	cmake --preset release
 	cmake --build --preset release --target formkit
 	bash scripts/demo
+
+# The studio in the browser on a copy of the examples (build/studio-demo), at
+# http://127.0.0.1:8080/ until interrupted.
+studio: deps
+	cmake --preset release
+	cmake --build --preset release --target formkit
+	rm -rf build/studio-demo && mkdir -p build/studio-demo
+	cp examples/*.kfm examples/*.fks build/studio-demo/
+	build/release/host/formkit studio build/studio-demo --port 8080
 
 # clang under AddressSanitizer, UndefinedBehaviorSanitizer and LeakSanitizer, with the fuzz targets.
 test-build: deps
@@ -30,14 +39,15 @@ threads: deps
 	  --gtest_filter='*Process*:*Thread*'
 
 # Both compilers, because each finds faults the other misses: the sanitizer build's tests and
-# bounded fuzz runs first, the runner's threads, then the g++ build's tests, whose CTest
-# summary ends the output.
+# bounded fuzz runs first, the runner's threads, the installed package, the studio in headless
+# Chromium, then the g++ build's tests, whose CTest summary ends the output.
 test: test-build
 	ctest --preset test
 	$(MAKE) --no-print-directory threads
 	cmake --preset release
 	cmake --build --preset release
 	bash scripts/check-consumer
+	FORMKIT=build/release/host/formkit bash scripts/studio-e2e
 	ctest --preset release
 
 fuzz: test-build
