@@ -17,6 +17,7 @@
 #pragma once
 
 #include "frameworks/kiln/KilnControls.h"
+#include "frameworks/kiln/KilnMenus.h"
 #include "platform/Lists.h"
 
 namespace formkit {
@@ -25,9 +26,6 @@ namespace formkit {
 FK_ENUM(TScrollStyle, std::uint8_t, ssNone, ssHorizontal, ssVertical, ssBoth)
 /// A key went down over a control; a handler may clear `Key` to swallow it.
 FK_EVENT(TKeyEvent, void(TObject* Sender, std::uint16_t& Key, TShiftState Shift));
-
-/// The virtual key codes the controls react to.
-inline constexpr std::uint16_t vkEscape = 27;
 
 /// The lines of a text control: a string list that goes to form files as the list
 /// property "Strings" when it differs from the ancestor's (or, without one, is not empty).

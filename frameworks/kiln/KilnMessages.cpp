@@ -71,6 +71,12 @@ int RemoveMessages(TMessageTarget* Target) noexcept {
   return static_cast<int>(Before - Queue.size());
 }
 
+bool MessageQueued(TMessageTarget* Target, std::uint32_t Msg) noexcept {
+  auto& Queue = MessageQueue();
+  return std::any_of(Queue.begin(), Queue.end(),
+                     [&](const TQueuedMessage& Q) { return Q.Target == Target && Q.Message.Msg == Msg; });
+}
+
 int PendingMessageCount(TMessageTarget* Target) noexcept {
   auto& Queue = MessageQueue();
   if (!Target) return static_cast<int>(Queue.size());

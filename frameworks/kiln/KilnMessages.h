@@ -100,5 +100,7 @@ FK_API bool PeekMessage(TMessageTarget*& Target, TMessage& Message, std::uint32_
 FK_API int RemoveMessages(TMessageTarget* Target) noexcept;
 /// The number of queued messages, for `Target` alone or for all when it is null.
 FK_API int PendingMessageCount(TMessageTarget* Target = nullptr) noexcept;
+/// Whether a message `Msg` for `Target` waits in the queue.
+[[nodiscard]] FK_API bool MessageQueued(TMessageTarget* Target, std::uint32_t Msg) noexcept;
 
 } // namespace formkit

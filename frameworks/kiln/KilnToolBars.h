@@ -17,6 +17,8 @@
 
 namespace formkit {
 
+class TAction;
+
 /// A strip of equally sized buttons.
 class FK_API TToolBar : public TWinControl {
   FK_CLASS(TToolBar, TWinControl)
@@ -39,6 +41,37 @@ private:
   bool FShowHint = false;
   int FButtonWidth = 23;
   int FButtonHeight = 22;
+};
+
+FK_ENUM(TToolButtonStyle, std::uint8_t, tbsButton, tbsCheck, tbsDropDown, tbsSeparator, tbsDivider)
+
+/// A button of a tool bar, or a gap between groups of them. Linked to an action, it
+/// shows the action's caption and hint, is enabled with it and runs it when clicked.
+class FK_API TToolButton : public TGraphicControl {
+  FK_CLASS(TToolButton, TGraphicControl)
+  void Create(TComponent* AOwner) override;
+  void BeforeDestruction() override;
+
+  TToolButtonStyle Style() const noexcept { return FStyle; }
+  void SetStyle(TToolButtonStyle Value) noexcept { FStyle = Value; }
+  /// The linked action; not owned, and dropped when it goes.
+  TAction* Action() const noexcept { return FAction; }
+  void SetAction(TAction* Value);
+  /// The action's caption, or none.
+  String Caption() const;
+  String Hint() const;
+  /// Whether a click runs anything: a button whose action is enabled (after the action
+  /// updated itself).
+  bool ButtonEnabled() const;
+  /// Runs the action when enabled, then calls `OnClick`.
+  void Click() override;
+
+protected:
+  void Notification(TComponent* AComponent, TOperation Operation) override;
+
+private:
+  TToolButtonStyle FStyle = tbsButton;
+  TAction* FAction = nullptr;
 };
 
 } // namespace formkit
