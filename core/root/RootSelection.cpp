@@ -2,6 +2,7 @@
 #include "core/root/ComponentRoot.h"
 
 #include "core/DesignNotifications.h"
+#include "core/root/RootItems.h"
 
 namespace formkit {
 
@@ -123,7 +124,9 @@ void TComponentRoot::Select(TPersistent* Instance, bool Add) {
   try {
     if (!Add) Items->Clear();
     auto* Component = dynamic_cast<TComponent*>(Instance);
-    IPtr<IItem> Item = Component ? FSurface->ItemFromComponent(Component) : nullptr;
+    // A persistent that is no component (a collection's item, a font) has no place on
+    // the surface, but the inspector still shows it when it is selected.
+    IPtr<IItem> Item = Component ? FSurface->ItemFromComponent(Component) : NewAs<IItem, TNonControlItem>(Instance, AsDesigner());
     if (auto Internal = QueryAs<IInternalItem>(Item)) {
       Items->Add(Item);
       Internal->Show();
