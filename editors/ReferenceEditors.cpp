@@ -13,6 +13,9 @@ FK_IMPLEMENT(TVariantProperty, "DesignEditors") {}
 FK_IMPLEMENT(TVariantTypeProperty, "DesignEditors") {}
 FK_IMPLEMENT(TCollectionProperty, "DesignEditors") {}
 
+TShowCollectionEditorProc ShowCollectionEditorProc;
+TClass DefaultCollectionEditorClass = nullptr;
+
 namespace {
 [[noreturn]] void RaiseInvalidValue() { throw EDesignPropertyError(SInvalidPropertyValue); }
 
@@ -373,6 +376,27 @@ void TVariantTypeProperty::SetValue(const String& Value) {
     }
   }
   SetVarValue(V);
+}
+
+} // namespace formkit
+
+namespace formkit {
+
+//===----------------------------------------------------------------------===//
+// TCollectionProperty
+//===----------------------------------------------------------------------===//
+
+TClass TCollectionProperty::GetEditorClass() { return DefaultCollectionEditorClass; }
+
+TColOptions TCollectionProperty::GetColOptions() { return TColOptions{coAdd, coDelete, coMove}; }
+
+void TCollectionProperty::Edit() {
+  TPersistent* Walk = GetComponent(0);
+  while (Walk && !dynamic_cast<TComponent*>(Walk)) Walk = Walk->GetOwner();
+  auto* Collection = dynamic_cast<TCollection*>(GetObjectProp(GetComponent(0), GetPropInfo()));
+  if (!ShowCollectionEditorProc || !Collection) return;
+  ShowCollectionEditorProc(Designer(), GetEditorClass(), dynamic_cast<TComponent*>(Walk), Collection, GetName(),
+                           GetColOptions());
 }
 
 } // namespace formkit

@@ -15,6 +15,8 @@
 
 #include "editors/ScalarEditors.h"
 
+#include <functional>
+
 namespace formkit {
 
 //===----------------------------------------------------------------------===//
@@ -171,9 +173,31 @@ class FK_API TVariantTypeProperty : public TNestedProperty {
 /// The names of variant type codes 0 to 20; null where a code has none.
 FK_API const char* VariantTypeName(int Code) noexcept;
 
-/// Collections: the behaviour of an object property.
+/// What a collection editor lets the user do with the items.
+FK_ENUM(TColOption, std::uint8_t, coAdd, coDelete, coMove)
+using TColOptions = TSet<TColOption>;
+
+/// Opens the collection editor window of class `EditorClass` for `Collection`, the
+/// property `PropertyName` of `Component`, or brings the open one to the front. Set by
+/// the framework package that holds the window; empty while none is loaded.
+using TShowCollectionEditorProc =
+    std::function<void(const IPtr<IDesigner>& Designer, TClass EditorClass, TComponent* Component,
+                       TCollection* Collection, const String& PropertyName, TColOptions Options)>;
+FK_API extern TShowCollectionEditorProc ShowCollectionEditorProc;
+/// The window class the editor opens by default; set with `ShowCollectionEditorProc`.
+FK_API extern TClass DefaultCollectionEditorClass;
+
+/// Collections: a dialog of the items, which the collection editor window shows.
 class FK_API TCollectionProperty : public TClassProperty {
   FK_CLASS(TCollectionProperty, TClassProperty)
+  TPropertyAttributes GetAttributes() override { return TPropertyAttributes{paDialog, paReadOnly, paKiln}; }
+  /// Opens the editor window for the collection of the first object, named after the
+  /// component that holds it (found up the owners).
+  void Edit() override;
+  /// The window's class: `DefaultCollectionEditorClass` unless a descendant says another.
+  virtual TClass GetEditorClass();
+  /// All three operations unless a descendant says fewer.
+  virtual TColOptions GetColOptions();
 };
 
 } // namespace formkit

@@ -1,5 +1,6 @@
 //===- frameworks/kiln/design/KilnDesigner.cpp - The Kiln designer -------===//
 #include "frameworks/kiln/design/KilnDesign.h"
+#include "frameworks/kiln/design/ColnEdit.h"
 #include "frameworks/kiln/design/KilnCategories.h"
 #include "frameworks/kiln/design/KilnActionEditors.h"
 #include "frameworks/kiln/design/KilnEditors.h"
@@ -145,6 +146,7 @@ void RegisterKilnDesignPackage() {
   RegisterPictureEditors();
   RegisterKilnActionEditors();
   RegisterStringEditors();
+  RegisterCollectionEditor();
   RegisterKilnEditors();
   // Creation on a surface scales by the pixels per inch of the parent control.
   GetPPIForKilnDesignerForIItemFunc = [](const IPtr<IItem>& Item) {
