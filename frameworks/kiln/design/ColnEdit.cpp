@@ -15,6 +15,8 @@ namespace formkit {
 
 FK_IMPLEMENT(TCollectionEditor, "ColnEdit") {}
 
+FK_RESOURCESTRING(SNoCollectionToEdit, "There is no collection to edit");
+
 namespace {
 
 /// Every open editor; made by the first `ShowCollectionEditorClass`.
@@ -377,6 +379,7 @@ void TCollectionEditor::WriteWindowState() {
 //===----------------------------------------------------------------------===//
 
 void TCollectionEditor::AddClick(TObject*) {
+  if (!Collection) return; // closed: the commands have nothing to work on
   SelectNone(false);
   {
     const int Before = Collection->Count();
@@ -403,6 +406,7 @@ void TCollectionEditor::AddClick(TObject*) {
 }
 
 void TCollectionEditor::DeleteClick(TObject*) {
+  if (!Collection) return;
   int Remembered = -1;
   {
     Collection->BeginUpdate();
@@ -429,6 +433,7 @@ void TCollectionEditor::DeleteClick(TObject*) {
 }
 
 void TCollectionEditor::MoveSelected(bool Down) {
+  if (!Collection) return;
   TListItems* Rows = FListView1->Items();
   const int Selected = FListView1->SelCount();
   if (Selected == 0 || Selected == Rows->Count()) return;
@@ -475,7 +480,7 @@ void TCollectionEditor::ListView1DragOver(TObject*, TObject* Source, int X, int 
 
 void TCollectionEditor::ListView1DragDrop(TObject*, TObject*, int X, int Y) {
   TListItem* Row = FListView1->GetItemAt(X, Y);
-  if (!Row) return;
+  if (!Row || !Collection) return;
   int Target = Row->Index();
   std::vector<TCollectionItem*> Items;
   for (int I = 0; I < FListView1->Items()->Count(); ++I)
@@ -549,6 +554,7 @@ TCollectionEditor* ShowCollectionEditorClass(const IPtr<IDesigner>& ADesigner,
                                              TCollectionEditorClass CollectionEditorClass, TComponent* AComponent,
                                              TCollection* ACollection, const String& PropertyName,
                                              TColOptions ColOptions) {
+  if (!ACollection) throw EInvalidOperation(SNoCollectionToEdit);
   if (!GEditors) GEditors = std::make_unique<std::vector<TCollectionEditor*>>();
   for (TCollectionEditor* Open : *GEditors) {
     if (Open->Designer().Get() == ADesigner.Get() && Open->Component == AComponent &&

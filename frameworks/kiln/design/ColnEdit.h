@@ -163,7 +163,8 @@ using TCollectionEditorClass = TClass;
 /// Shows the editor of `ACollection`, the property `PropertyName` of `AComponent` in
 /// `ADesigner`'s module: the open one (brought to the front), or a new window of
 /// `CollectionEditorClass` with the application as owner. A step that raises frees
-/// the new window and raises again.
+/// the new window and raises again. Raises `EInvalidOperation` "There is no collection
+/// to edit" for a null collection.
 FK_API TCollectionEditor* ShowCollectionEditorClass(const IPtr<IDesigner>& ADesigner,
                                                     TCollectionEditorClass CollectionEditorClass,
                                                     TComponent* AComponent, TCollection* ACollection,

@@ -180,6 +180,13 @@ TEST_F(CollectionEditorTest, ColEditOpensOneWindowPerPropertyWithItsCommands) {
   TCollectionEditor* NoAdd = ShowCollectionEditorClass(Form->GetDesigner(), TCollectionEditor::StaticClass(), Bar,
                                                        Bar->Panels(), "Third", TColOptions{coDelete});
   EXPECT_FALSE(NoAdd->AddCmd()->Enabled());
+  try {
+    (void)Open(Bar, nullptr, "Nothing");
+    FAIL() << "a window without a collection";
+  } catch (const EInvalidOperation& E) {
+    EXPECT_EQ(E.Message(), "There is no collection to edit");
+  }
+  EXPECT_EQ(CollectionEditorsList()->size(), 3u);
 }
 
 TEST_F(CollectionEditorTest, ColEditAddsDeletesMovesAndKeepsTheDesignerInStep) {
@@ -282,6 +289,9 @@ TEST_F(CollectionEditorTest, ColEditFollowsDeletionsAndClosesWithItsComponentOrM
   Bar = nullptr;
   EXPECT_TRUE(Editor->Closing());
   EXPECT_EQ(Editor->Collection, nullptr);
+  Editor->AddCmd()->Execute(); // closed: nothing to add to
+  Editor->ItemsModified(Form->GetDesigner());
+  EXPECT_EQ(Shown(Editor), Rows{"0 - TStatusPanel"});
   ProcessMessages();
   EXPECT_FALSE(IsOpen(Editor));
 
